@@ -1,0 +1,38 @@
+# The two commands of the README, and a few more.
+#   make demo    build, install into ./dist and run the example
+#   make test    build everything and run every test
+BUILD      ?= build
+PREFIX     ?= $(CURDIR)/dist
+JOBS       ?= $(shell nproc)
+CMAKE_ARGS ?=
+
+.PHONY: all deps configure build test demo install bench clean
+
+all: build
+
+deps:
+	@scripts/install-deps.sh
+
+configure: deps
+	@cmake -S . -B $(BUILD) -DCMAKE_INSTALL_PREFIX=$(PREFIX) -DULK_WERROR=ON $(CMAKE_ARGS) >/dev/null
+
+build: configure
+	@cmake --build $(BUILD) -j $(JOBS)
+
+test: build
+	@cd $(BUILD) && ctest --output-on-failure -j $(JOBS)
+
+install: build
+	@cmake --install $(BUILD) >/dev/null
+	@echo "Installed the ULK SDK into $(PREFIX)"
+
+demo: install
+	@scripts/demo.sh $(PREFIX)
+
+bench: deps
+	@cmake -S . -B $(BUILD)-bench -DCMAKE_BUILD_TYPE=Release -DULK_BUILD_BENCH=ON -DULK_BUILD_TESTS=OFF >/dev/null
+	@cmake --build $(BUILD)-bench -j $(JOBS)
+	@scripts/bench.sh $(BUILD)-bench
+
+clean:
+	@rm -rf $(BUILD) $(BUILD)-* $(PREFIX)

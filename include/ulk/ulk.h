@@ -1,0 +1,27 @@
+// The ULK interface: everything a host application or an effect plug-in needs.
+//
+// A host includes this header and links libulk; a plug-in includes it too,
+// derives its classes from the plug-in bases (ulkModel_v1, ulkInstance_v1,
+// ulkOverlay_v1) and exports its entry points with ULK_PLUGIN_EXPORT.
+#ifndef ULK_ULK_H
+#define ULK_ULK_H
+
+#include "ulk/export.h"
+
+// Core services: lists, errors, process-wide host services.
+#include "ulk/core/types.h"
+#include "ulk/core/list.h"
+
+// Plug-in modules and the module registry.
+
+// Images: formats, image buffers, media objects.
+
+// Parameters: key frames, the parameter kinds, value text.
+
+// Effect models.
+
+// Effect instances.
+
+// Overlays.
+
+#endif  // ULK_ULK_H
