@@ -11,8 +11,13 @@
 // Core services: lists, errors, process-wide host services.
 #include "ulk/core/types.h"
 #include "ulk/core/list.h"
+#include "ulk/core/error.h"
+#include "ulk/core/host_global.h"
 
 // Plug-in modules and the module registry.
+#include "ulk/modules/entry_points.h"
+#include "ulk/modules/dll.h"
+#include "ulk/modules/dll_maker.h"
 
 // Images: formats, image buffers, media objects.
 

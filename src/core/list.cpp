@@ -22,7 +22,9 @@ ulkList::~ulkList() {
 
 bool ulkList::SetMaxEntries(int n) {
     if (n <= mMaxEntries) return true;
-    const int slots = n + mGrain;
+    // A negative grain (a registry bound set below zero) must never make the
+    // array smaller than the n entries asked for.
+    const int slots = n + (mGrain > 0 ? mGrain : 0);
     ulkNode** entries = new (std::nothrow) ulkNode*[slots]();
     if (!entries) return false;
     if (mCount > 0) std::memcpy(entries, mEntries, sizeof(ulkNode*) * mCount);
