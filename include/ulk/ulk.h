@@ -20,6 +20,9 @@
 #include "ulk/modules/dll_maker.h"
 
 // Images: formats, image buffers, media objects.
+#include "ulk/image/image_format.h"
+#include "ulk/image/media_object.h"
+#include "ulk/image/image.h"
 
 // Parameters: key frames, the parameter kinds, value text.
 
