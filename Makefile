@@ -6,7 +6,7 @@ PREFIX     ?= $(CURDIR)/dist
 JOBS       ?= $(shell nproc)
 CMAKE_ARGS ?=
 
-.PHONY: all deps configure build test demo install bench clean
+.PHONY: all deps configure build test test-sanitize demo install bench clean
 
 all: build
 
@@ -21,6 +21,14 @@ build: configure
 
 test: build
 	@cd $(BUILD) && ctest --output-on-failure -j $(JOBS)
+	@$(MAKE) --no-print-directory test-sanitize
+
+# The whole suite again under AddressSanitizer and UndefinedBehaviorSanitizer.
+test-sanitize: deps
+	@cmake -S . -B $(BUILD)-sanitize -DULK_SANITIZE=ON -DULK_WERROR=ON -DCMAKE_BUILD_TYPE=Debug $(CMAKE_ARGS) >/dev/null
+	@cmake --build $(BUILD)-sanitize -j $(JOBS)
+	@cd $(BUILD)-sanitize && ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 \
+		ctest --output-on-failure -j $(JOBS)
 
 install: build
 	@cmake --install $(BUILD) >/dev/null
