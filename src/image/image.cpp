@@ -47,18 +47,29 @@ Layout LayoutFor(int32_t format) {
     const ulkImgChannel A = kImgChannelA, R = kImgChannelRV, G = kImgChannelG, B = kImgChannelBU,
                         Y0 = kImgChannelY0, Y1 = kImgChannelY1, N = kImgChannelNone;
     switch (format) {
-        case kImgFormatRGB: return {3, {R, G, B, N, N}};
-        case kImgFormatBGR: return {3, {B, G, R, N, N}};
-        case kImgFormatRGBA: return {4, {R, G, B, A, N}};
-        case kImgFormatABGR: return {4, {A, B, G, R, N}};
-        case kImgFormatARGB: return {4, {A, R, G, B, N}};
-        case kImgFormatBGRA: return {4, {B, G, R, A, N}};
+        case kImgFormatRGB:
+            return {3, {R, G, B, N, N}};
+        case kImgFormatBGR:
+            return {3, {B, G, R, N, N}};
+        case kImgFormatRGBA:
+            return {4, {R, G, B, A, N}};
+        case kImgFormatABGR:
+            return {4, {A, B, G, R, N}};
+        case kImgFormatARGB:
+            return {4, {A, R, G, B, N}};
+        case kImgFormatBGRA:
+            return {4, {B, G, R, A, N}};
         case kImgFormatYUV422:
-        case kImgFormatUYVY: return {4, {B, Y0, R, Y1, N}};
-        case kImgFormatYUYV: return {4, {Y0, B, Y1, R, N}};
-        case kImgFormatUYVYAlpha: return {5, {B, Y0, R, Y1, A}};
-        case kImgFormatYUYVAlpha: return {5, {Y0, B, Y1, R, A}};
-        default: return {0, {N, N, N, N, N}};
+        case kImgFormatUYVY:
+            return {4, {B, Y0, R, Y1, N}};
+        case kImgFormatYUYV:
+            return {4, {Y0, B, Y1, R, N}};
+        case kImgFormatUYVYAlpha:
+            return {5, {B, Y0, R, Y1, A}};
+        case kImgFormatYUYVAlpha:
+            return {5, {Y0, B, Y1, R, A}};
+        default:
+            return {0, {N, N, N, N, N}};
     }
 }
 
@@ -314,8 +325,8 @@ unsigned char* ulkImage::CreateBuffer() {
         }
         if (planes > size) size = planes;
 
-        const int placed = HasAlphaPlane(format) ? 4
-                           : (mNumChannels > kMaxChannels ? kMaxChannels : mNumChannels);
+        const int placed =
+            HasAlphaPlane(format) ? 4 : (mNumChannels > kMaxChannels ? kMaxChannels : mNumChannels);
         for (int i = 0; i < placed; ++i) {
             const int64_t rowDelta = mRowDeltaSet ? int64_t{mRowDelta[i]} : rowDelta0;
             const int64_t columns = packed ? mWidth / 2 : mWidth;

@@ -43,7 +43,7 @@ enum ulkOrientation : int32_t {};
 
 /// A view of pixel memory: format, size and per-channel placement.
 class ULK_API ulkImage : public ulkMediaObject {
-public:
+  public:
     /// Number of channel slots.
     static constexpr int kMaxChannels = 8;
 
@@ -125,7 +125,7 @@ public:
     int32_t mRowDelta[kMaxChannels];
     bool mRowDeltaSet;
 
-protected:
+  protected:
     ulkImage();
     ~ulkImage() override;
     /// Lays the channels out for the embedded format's code (count, types, sizes, steps).

@@ -49,14 +49,15 @@ enum ulkColorspace : int32_t {
 
 /// One pixel format: format code, colour space, bits per sample, order text.
 class ULK_API ulkImageFormat : public ulkNode {
-public:
+  public:
     /// Format -1, colour space -1 (both "not set"), bit depth 8, no order text; in no list.
     ulkImageFormat();
     /// A deep copy of source (its own order text); the copy is in no list.
     ulkImageFormat(const ulkImageFormat& source);
     /// Releases the order text.
     ~ulkImageFormat();
-    /// Makes the four fields equal to source's, as Copy does; list membership stays this format's own.
+    /// Makes the four fields equal to source's, as Copy does; list membership stays this format's
+    /// own.
     ulkImageFormat& operator=(const ulkImageFormat& source);
 
     // --- format code, colour space, bit depth (any value is stored)

@@ -13,7 +13,7 @@
 
 /// Abstract media: a list node with a virtual destructor and a class name.
 class ULK_API ulkMediaObject : public ulkNode {
-public:
+  public:
     /// In no list.
     ulkMediaObject() {}
     /// There is nothing to copy but the node part; the copy is in no list.
