@@ -31,5 +31,9 @@
 // Effect instances.
 
 // Overlays.
+#include "ulk/overlay/overlay_context.h"
+#include "ulk/overlay/overlay_mode.h"
+#include "ulk/overlay/host_overlay.h"
+#include "ulk/overlay/overlay.h"
 
 #endif  // ULK_ULK_H
