@@ -205,6 +205,8 @@ TEST(ImageTest, ChangingTheEmbeddedFormatDoesNotLayOutAgain) {
     image->SetFormat(image->GetFormat());
     EXPECT_EQ(image->GetNumChannels(), 4);
     EXPECT_STREQ(image->GetFormat()->GetOrder(), "rgba-custom");
+    const ulkImage& view = *image;
+    EXPECT_EQ(view.GetFormat(), image->GetFormat());
 }
 
 // ------------------------------------------------------------------ placement

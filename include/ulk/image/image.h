@@ -63,6 +63,8 @@ class ULK_API ulkImage : public ulkMediaObject {
     // --- format and size
     /// The embedded format; changing it through this pointer does not lay the channels out again.
     ulkImageFormat* GetFormat() { return &mFormat; }
+    /// The embedded format, read-only.
+    const ulkImageFormat* GetFormat() const { return &mFormat; }
     /// Copies format into the embedded one, then lays the channels out for its format code.
     void SetFormat(ulkImageFormat* format);
     ulkImgFormat GetImgFormat() const { return mFormat.GetFormat(); }
