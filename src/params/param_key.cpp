@@ -1,0 +1,44 @@
+#include "ulk/params/param_key.h"
+
+#include <cmath>
+#include <cstring>
+#include <new>
+
+ulkParamKey::ulkParamKey(double time)
+    : mTime(time), mValue(nullptr), mValueSize(0), mUserData(nullptr), mIsActive(false) {}
+
+ulkParamKey::~ulkParamKey() {
+    delete[] static_cast<unsigned char*>(mValue);
+}
+
+double ulkParamKey::GetTime() const {
+    // Truncation to whole 0.00000001 steps. Within +-21.47483648 this is exactly
+    // the 32-bit integer conversion; beyond it the same truncation still holds
+    // instead of an out-of-range integer conversion.
+    return std::trunc(mTime * 100000000.0) / 100000000.0;
+}
+
+bool ulkParamKey::SetValue(const void* source, size_t size) {
+    if (mValue) {
+        if (source && size == mValueSize) {
+            // memmove: the source may be this very buffer.
+            std::memmove(mValue, source, size);
+            return true;
+        }
+        delete[] static_cast<unsigned char*>(mValue);
+        mValue = nullptr;
+        mValueSize = 0;
+    }
+    if (!source || size == 0) return true;
+    unsigned char* buffer = new (std::nothrow) unsigned char[size];
+    if (!buffer) return false;
+    std::memcpy(buffer, source, size);
+    mValue = buffer;
+    mValueSize = size;
+    return true;
+}
+
+bool ulkParamKey::CopyValue(const ulkParamKey* other) {
+    if (!other) return SetValue(nullptr, 0);
+    return SetValue(other->mValue, other->mValueSize);
+}
