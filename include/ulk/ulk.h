@@ -25,6 +25,15 @@
 #include "ulk/image/image.h"
 
 // Parameters: key frames, the parameter kinds, value text.
+#include "ulk/params/param_key.h"
+#include "ulk/params/file.h"
+#include "ulk/params/parameter.h"
+#include "ulk/params/number.h"
+#include "ulk/params/boolean.h"
+#include "ulk/params/param_list.h"
+#include "ulk/params/compound.h"
+#include "ulk/params/param_string.h"
+#include "ulk/params/group.h"
 
 // Effect models.
 
