@@ -88,10 +88,10 @@ int PlanesOf(const ulkImage& image, Plane planes[2]) {
     const int64_t width = image.GetWidth();
     int64_t rowBytes = image.GetPixelDelta(0) * width;
     if (IsPacked422(format)) rowBytes /= 2;
-    planes[0] = {image.GetChannelPtr(0), image.GetRowDelta(0), rowBytes};
+    planes[0] = {image.mChannelPtr[0], image.GetRowDelta(0), rowBytes};
     if (!HasAlphaPlane(format)) return 1;
     if (!image.GetChannelPtr(4)) return 0;
-    planes[1] = {image.GetChannelPtr(4), image.GetRowDelta(4), image.GetPixelDelta(4) * width};
+    planes[1] = {image.mChannelPtr[4], image.GetRowDelta(4), image.GetPixelDelta(4) * width};
     return 2;
 }
 
@@ -228,7 +228,7 @@ int ulkImage::GetChannelSize(int index) const {
     return ValidChannel(index) ? mChannelSize[index] : 0;
 }
 
-unsigned char* ulkImage::GetChannelPtr(int index) const {
+void* ulkImage::GetChannelPtr(int index) const {
     return ValidChannel(index) ? mChannelPtr[index] : nullptr;
 }
 
@@ -244,12 +244,12 @@ int ulkImage::GetRowDelta(int index) const {
     return ValidChannel(index) ? mRowDelta[index] : 0;
 }
 
-unsigned char* ulkImage::GetRowPtr(int row, int channel) const {
+void* ulkImage::GetRowPtr(int row, int channel) const {
     if (!ValidChannel(channel)) return nullptr;
     return Advance(mChannelPtr[channel], int64_t{mRowDelta[channel]} * row);
 }
 
-unsigned char* ulkImage::GetPixelPtr(int x, int y, int channel) const {
+void* ulkImage::GetPixelPtr(int x, int y, int channel) const {
     if (!ValidChannel(channel)) return nullptr;
     if (x < 0 || x >= mWidth || y < 0 || y >= mHeight) return nullptr;
     // A packed channel's row holds width / 2 pairs; a pair index beyond them would
@@ -267,7 +267,8 @@ void ulkImage::SetRowDelta(int bytes) {
     mRowDeltaSet = true;
 }
 
-void ulkImage::SetData(unsigned char* data) {
+void ulkImage::SetData(void* buffer) {
+    unsigned char* data = static_cast<unsigned char*>(buffer);
     const int32_t format = mFormat.GetFormat();
     const int count = mNumChannels > kMaxChannels ? kMaxChannels : mNumChannels;
     if (IsInterleaved(format) || IsPacked422(format)) {
@@ -292,7 +293,7 @@ void ulkImage::SetData(unsigned char* data) {
     mRowDeltaSet = false;
 }
 
-unsigned char* ulkImage::CreateBuffer() {
+void* ulkImage::CreateBuffer() {
     const int32_t format = mFormat.GetFormat();
     const bool packed = IsPacked422(format);
     const bool placesChannels = IsInterleaved(format) || packed;
@@ -345,8 +346,8 @@ unsigned char* ulkImage::CreateBuffer() {
     return buffer;
 }
 
-void ulkImage::FreeBuffer(unsigned char* buffer) {
-    delete[] buffer;
+void ulkImage::FreeBuffer(void* buffer) {
+    delete[] static_cast<unsigned char*>(buffer);
 }
 
 bool ulkImage::Copy(const ulkImage* source, const ulkBounds* region) {

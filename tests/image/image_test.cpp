@@ -12,6 +12,12 @@
 
 namespace {
 
+// The image answers untyped addresses; the tests look at bytes.
+unsigned char* Bytes(void* p) {
+    return static_cast<unsigned char*>(p);
+}
+
+
 // An image that deletes itself, and optionally the buffer CreateBuffer gave it.
 struct ImageDeleter {
     void operator()(ulkImage* image) const { ulkImage::Delete(image); }
@@ -57,7 +63,7 @@ void Paint(ulkImage* image, int columns, int salt = 0) {
     for (int c = 0; c < image->GetNumChannels(); ++c) {
         const int cols = c < 4 ? columns : image->GetWidth();
         for (int y = 0; y < image->GetHeight(); ++y)
-            for (int x = 0; x < cols; ++x) *image->GetPixelPtr(x, y, c) = Pattern(x, y, c, salt);
+            for (int x = 0; x < cols; ++x) *Bytes(image->GetPixelPtr(x, y, c)) = Pattern(x, y, c, salt);
     }
 }
 
@@ -68,7 +74,7 @@ int Mismatches(const ulkImage* image, int columns, int salt = 0) {
         const int cols = c < 4 ? columns : image->GetWidth();
         for (int y = 0; y < image->GetHeight(); ++y)
             for (int x = 0; x < cols; ++x)
-                if (*image->GetPixelPtr(x, y, c) != Pattern(x, y, c, salt)) ++bad;
+                if (*Bytes(image->GetPixelPtr(x, y, c)) != Pattern(x, y, c, salt)) ++bad;
     }
     return bad;
 }
@@ -111,7 +117,7 @@ TEST(ImageTest, NewImageIsEmpty) {
     EXPECT_EQ(image->GetImgFormat(), -1);
     EXPECT_EQ(image->GetColorspace(), -1);
     for (int i = 0; i < 8; ++i) {
-        EXPECT_EQ(image->GetChannelPtr(i), nullptr);
+        EXPECT_EQ(Bytes(image->GetChannelPtr(i)), nullptr);
         EXPECT_EQ(image->GetChannelType(i), kImgChannelNone);
         EXPECT_EQ(image->GetChannelSize(i), 0);
         EXPECT_EQ(image->GetChannelDelta(i), 0);
@@ -141,7 +147,7 @@ TEST(ImageTest, EveryFormatCodeLaysOutItsChannels) {
                 EXPECT_EQ(image->GetChannelSize(i), bits) << i;
                 EXPECT_EQ(image->GetChannelDelta(i), s) << i;
                 EXPECT_EQ(image->GetPixelDelta(i), layout.pixelSamples[i] * s) << i;
-                EXPECT_EQ(image->GetChannelPtr(i), nullptr) << "SetFormat places nothing";
+                EXPECT_EQ(Bytes(image->GetChannelPtr(i)), nullptr) << "SetFormat places nothing";
                 EXPECT_EQ(image->GetRowDelta(i), 0) << "SetFormat sets no row delta";
             }
             for (int i = layout.count; i < 8; ++i)
@@ -215,16 +221,16 @@ TEST(ImageTest, Rgba8At640x480) {
     ImagePtr image = MakeImage(kImgFormatRGBA, 8, 640, 480);
     EXPECT_EQ(image->GetChannel(kImgChannelA), 3);
     alloc_hooks::gLastArraySize = 0;
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     ASSERT_NE(p, nullptr);
     EXPECT_EQ(alloc_hooks::gLastArraySize, 1228800u);
     for (int i = 0; i < 4; ++i) {
-        EXPECT_EQ(image->GetChannelPtr(i), p + i);
+        EXPECT_EQ(Bytes(image->GetChannelPtr(i)), p + i);
         EXPECT_EQ(image->GetRowDelta(i), 2560);
     }
-    EXPECT_EQ(image->GetPixelPtr(1, 1, 0), p + 2564);
-    EXPECT_EQ(image->GetPixelPtr(639, 479, 3), p + 1228799);
-    EXPECT_EQ(image->GetRowPtr(2, 1), p + 5121);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(1, 1, 0)), p + 2564);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(639, 479, 3)), p + 1228799);
+    EXPECT_EQ(Bytes(image->GetRowPtr(2, 1)), p + 5121);
 
     // Real pixels: what goes in through channel A of pixel (x, y) is byte 4x + 3 of row y.
     Paint(image.get(), 640);
@@ -239,15 +245,15 @@ TEST(ImageTest, Bgr16PlacesTwoByteSamples) {
     std::vector<uint16_t> pixels(3 * 3 * 2);
     unsigned char* p = reinterpret_cast<unsigned char*>(pixels.data());
     image->SetData(p);
-    EXPECT_EQ(image->GetChannelPtr(0), p);
-    EXPECT_EQ(image->GetChannelPtr(1), p + 2);
-    EXPECT_EQ(image->GetChannelPtr(2), p + 4);
+    EXPECT_EQ(Bytes(image->GetChannelPtr(0)), p);
+    EXPECT_EQ(Bytes(image->GetChannelPtr(1)), p + 2);
+    EXPECT_EQ(Bytes(image->GetChannelPtr(2)), p + 4);
     EXPECT_EQ(image->GetPixelDelta(0), 6);
     EXPECT_EQ(image->GetChannelDelta(0), 2);
     EXPECT_EQ(image->GetRowDelta(2), 18);
     EXPECT_EQ(image->GetChannelType(0), kImgChannelBU);
     EXPECT_EQ(image->GetChannelType(2), kImgChannelRV);
-    *reinterpret_cast<uint16_t*>(image->GetPixelPtr(2, 1, image->GetChannel(kImgChannelRV))) =
+    *reinterpret_cast<uint16_t*>(Bytes(image->GetPixelPtr(2, 1, image->GetChannel(kImgChannelRV)))) =
         0xBEEF;
     EXPECT_EQ(pixels[3 * 3 + 3 * 2 + 2], 0xBEEF);
 }
@@ -255,38 +261,38 @@ TEST(ImageTest, Bgr16PlacesTwoByteSamples) {
 TEST(ImageTest, Uyvy8PairsOfPixels) {
     ImagePtr image = MakeImage(kImgFormatUYVY, 8, 720, 486);
     alloc_hooks::gLastArraySize = 0;
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     ASSERT_NE(p, nullptr);
     EXPECT_EQ(alloc_hooks::gLastArraySize, 699840u);
     for (int i = 0; i < 4; ++i) {
         EXPECT_EQ(image->GetPixelDelta(i), 4);
         EXPECT_EQ(image->GetRowDelta(i), 1440);
-        EXPECT_EQ(image->GetChannelPtr(i), p + i);
+        EXPECT_EQ(Bytes(image->GetChannelPtr(i)), p + i);
     }
     // Pair x of row y is bytes 4x to 4x + 3: U Y0 V Y1.
-    *image->GetPixelPtr(359, 485, image->GetChannel(kImgChannelY1)) = 0x42;
+    *Bytes(image->GetPixelPtr(359, 485, image->GetChannel(kImgChannelY1))) = 0x42;
     EXPECT_EQ(p[1440 * 485 + 4 * 359 + 3], 0x42);
-    EXPECT_EQ(image->GetPixelPtr(360, 0, 0), nullptr) << "pairs end at width / 2";
-    EXPECT_EQ(image->GetPixelPtr(719, 0, 1), nullptr);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(360, 0, 0)), nullptr) << "pairs end at width / 2";
+    EXPECT_EQ(Bytes(image->GetPixelPtr(719, 0, 1)), nullptr);
     image->FreeBuffer(p);
 }
 
 TEST(ImageTest, UyvyAlphaHasAnAlphaPlane) {
     ImagePtr image = MakeImage(kImgFormatUYVYAlpha, 8, 720, 486);
     alloc_hooks::gLastArraySize = 0;
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     ASSERT_NE(p, nullptr);
     EXPECT_EQ(alloc_hooks::gLastArraySize, 1049760u);
     EXPECT_EQ(image->GetNumChannels(), 5);
     for (int i = 0; i < 4; ++i) {
-        EXPECT_EQ(image->GetChannelPtr(i), p + i);
+        EXPECT_EQ(Bytes(image->GetChannelPtr(i)), p + i);
         EXPECT_EQ(image->GetRowDelta(i), 1440);
     }
-    EXPECT_EQ(image->GetChannelPtr(4), p + 699840);
+    EXPECT_EQ(Bytes(image->GetChannelPtr(4)), p + 699840);
     EXPECT_EQ(image->GetPixelDelta(4), 1);
     EXPECT_EQ(image->GetRowDelta(4), 720);
-    EXPECT_EQ(image->GetPixelPtr(719, 485, 4), p + 1049759) << "the last byte of the buffer";
-    EXPECT_NE(image->GetPixelPtr(719, 485, 4), nullptr) << "the alpha plane counts pixels";
+    EXPECT_EQ(Bytes(image->GetPixelPtr(719, 485, 4)), p + 1049759) << "the last byte of the buffer";
+    EXPECT_NE(Bytes(image->GetPixelPtr(719, 485, 4)), nullptr) << "the alpha plane counts pixels";
     Paint(image.get(), 360);
     EXPECT_EQ(Mismatches(image.get(), 360), 0);
     EXPECT_EQ(p[699840 + 720 * 3 + 10], Pattern(10, 3, 4));
@@ -300,7 +306,7 @@ TEST(ImageTest, SetRowDeltaHoldsForOneSetData) {
     image->SetData(pixels.data());
     for (int i = 0; i < 4; ++i) EXPECT_EQ(image->GetRowDelta(i), 4096);
     EXPECT_EQ(image->GetRowDelta(4), 0) << "slots beyond the count are not written";
-    EXPECT_EQ(image->GetPixelPtr(1, 1, 0), pixels.data() + 4096 + 4);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(1, 1, 0)), pixels.data() + 4096 + 4);
     image->SetData(pixels.data());
     for (int i = 0; i < 4; ++i) EXPECT_EQ(image->GetRowDelta(i), 2560);
 }
@@ -312,7 +318,7 @@ TEST(ImageTest, YuyvAlphaAlphaPlaneFollowsPaddedRows) {
     image->SetData(buffer.data());
     for (int i = 0; i < 4; ++i) EXPECT_EQ(image->GetRowDelta(i), 3000);
     EXPECT_EQ(image->GetRowDelta(4), 720);
-    EXPECT_EQ(image->GetChannelPtr(4), buffer.data() + 3000 * 486);
+    EXPECT_EQ(Bytes(image->GetChannelPtr(4)), buffer.data() + 3000 * 486);
     Paint(image.get(), 360);
     EXPECT_EQ(Mismatches(image.get(), 360), 0) << "the planes do not overlap";
     EXPECT_TRUE(buffer.GuardsIntact());
@@ -322,9 +328,9 @@ TEST(ImageTest, FormatsWithoutLayoutPlaceNothing) {
     ImagePtr image = MakeImage(kImgFormatYUV, 8, 16, 16);
     unsigned char pixels[16];
     image->SetData(pixels);
-    for (int i = 0; i < 8; ++i) EXPECT_EQ(image->GetChannelPtr(i), nullptr);
+    for (int i = 0; i < 8; ++i) EXPECT_EQ(Bytes(image->GetChannelPtr(i)), nullptr);
     alloc_hooks::gLastArraySize = 123;
-    unsigned char* buffer = image->CreateBuffer();
+    unsigned char* buffer = Bytes(image->CreateBuffer());
     EXPECT_NE(buffer, nullptr);
     EXPECT_EQ(alloc_hooks::gLastArraySize, 0u) << "a zero-byte allocation";
     image->FreeBuffer(buffer);
@@ -332,14 +338,14 @@ TEST(ImageTest, FormatsWithoutLayoutPlaceNothing) {
 
 TEST(ImageTest, GetPixelPtrBounds) {
     ImagePtr image = MakeImage(kImgFormatRGB, 8, 5, 3);
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     ASSERT_NE(p, nullptr);
-    EXPECT_EQ(image->GetPixelPtr(5, 0, 0), nullptr);
-    EXPECT_EQ(image->GetPixelPtr(0, 3, 0), nullptr);
-    EXPECT_EQ(image->GetPixelPtr(-1, 0, 0), nullptr);
-    EXPECT_EQ(image->GetPixelPtr(0, -1, 0), nullptr);
-    EXPECT_EQ(image->GetPixelPtr(4, 2, 2), p + 15 * 2 + 12 + 2);
-    EXPECT_EQ(image->GetPixelPtr(0, 0, 0), p);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(5, 0, 0)), nullptr);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(0, 3, 0)), nullptr);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(-1, 0, 0)), nullptr);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(0, -1, 0)), nullptr);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(4, 2, 2)), p + 15 * 2 + 12 + 2);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(0, 0, 0)), p);
     image->FreeBuffer(p);
 }
 
@@ -348,30 +354,30 @@ TEST(ImageTest, CreateBufferMakesRoomForPaddedRows) {
     ImagePtr image = MakeImage(kImgFormatRGBA, 8, 10, 4);
     image->SetRowDelta(64);
     alloc_hooks::gLastArraySize = 0;
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     ASSERT_NE(p, nullptr);
     EXPECT_EQ(alloc_hooks::gLastArraySize, 64u * 4);
     EXPECT_EQ(image->GetRowDelta(0), 64);
-    EXPECT_EQ(image->GetPixelPtr(9, 3, 3), p + 64 * 3 + 36 + 3);
+    EXPECT_EQ(Bytes(image->GetPixelPtr(9, 3, 3)), p + 64 * 3 + 36 + 3);
     image->FreeBuffer(p);
 
     ImagePtr alpha = MakeImage(kImgFormatUYVYAlpha, 8, 8, 4);
     alpha->SetRowDelta(40);
     alloc_hooks::gLastArraySize = 0;
-    p = alpha->CreateBuffer();
+    p = Bytes(alpha->CreateBuffer());
     ASSERT_NE(p, nullptr);
     EXPECT_EQ(alloc_hooks::gLastArraySize, 40u * 4 + 8 * 4);
-    EXPECT_EQ(alpha->GetChannelPtr(4), p + 160);
-    EXPECT_EQ(alpha->GetPixelPtr(7, 3, 4), p + 160 + 31);
+    EXPECT_EQ(Bytes(alpha->GetChannelPtr(4)), p + 160);
+    EXPECT_EQ(Bytes(alpha->GetPixelPtr(7, 3, 4)), p + 160 + 31);
     alpha->FreeBuffer(p);
 
     // A channel count set below the layout's pixel step still gets room for every pixel.
     ImagePtr fewer = MakeImage(kImgFormatRGBA, 8, 10, 4);
     fewer->SetNumChannels(3);
     alloc_hooks::gLastArraySize = 0;
-    p = fewer->CreateBuffer();
+    p = Bytes(fewer->CreateBuffer());
     ASSERT_NE(p, nullptr);
-    EXPECT_GE(alloc_hooks::gLastArraySize, size_t(fewer->GetPixelPtr(9, 3, 2) - p + 1));
+    EXPECT_GE(alloc_hooks::gLastArraySize, size_t(Bytes(fewer->GetPixelPtr(9, 3, 2)) - p + 1));
     fewer->FreeBuffer(p);
 }
 
@@ -380,28 +386,28 @@ TEST(ImageTest, CreateBufferFailureLeavesTheImage) {
     unsigned char pixels[48];
     image->SetData(pixels);
     alloc_hooks::gFailNext = true;
-    EXPECT_EQ(image->CreateBuffer(), nullptr);
-    EXPECT_EQ(image->GetChannelPtr(0), pixels);
+    EXPECT_EQ(Bytes(image->CreateBuffer()), nullptr);
+    EXPECT_EQ(Bytes(image->GetChannelPtr(0)), pixels);
 
     ImagePtr huge = MakeImage(kImgFormatRGBA, 8, 1 << 30, 1 << 30);
-    EXPECT_EQ(huge->CreateBuffer(), nullptr);
-    EXPECT_EQ(huge->GetChannelPtr(0), nullptr);
+    EXPECT_EQ(Bytes(huge->CreateBuffer()), nullptr);
+    EXPECT_EQ(Bytes(huge->GetChannelPtr(0)), nullptr);
 }
 
 // ------------------------------------------------------------------ index checks
 
 TEST(ImageTest, ChannelIndexesOutsideTheSlots) {
     ImagePtr image = MakeImage(kImgFormatRGBA, 8, 4, 4);
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     for (int index : {-1, 8, 9, 1000, -1000}) {
         EXPECT_EQ(image->GetChannelType(index), kImgChannelNone) << index;
         EXPECT_EQ(image->GetChannelSize(index), 0) << index;
-        EXPECT_EQ(image->GetChannelPtr(index), nullptr) << index;
+        EXPECT_EQ(Bytes(image->GetChannelPtr(index)), nullptr) << index;
         EXPECT_EQ(image->GetChannelDelta(index), 0) << index;
         EXPECT_EQ(image->GetPixelDelta(index), 0) << index;
         EXPECT_EQ(image->GetRowDelta(index), 0) << index;
-        EXPECT_EQ(image->GetRowPtr(0, index), nullptr) << index;
-        EXPECT_EQ(image->GetPixelPtr(0, 0, index), nullptr) << index;
+        EXPECT_EQ(Bytes(image->GetRowPtr(0, index)), nullptr) << index;
+        EXPECT_EQ(Bytes(image->GetPixelPtr(0, 0, index)), nullptr) << index;
     }
     image->FreeBuffer(p);
 }
@@ -440,11 +446,11 @@ TEST(ImageTest, CopiesSharePixelsButNotFormatTexts) {
     ImagePtr image = MakeImage(kImgFormatARGB, 8, 8, 8);
     image->mOrientation = static_cast<ulkOrientation>(3);
     image->SetRowDelta(40);
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     image->SetRowDelta(40);  // a pending row delta travels with the copy
 
     ulkImage* copy = new ulkImage(*image);
-    EXPECT_EQ(copy->GetChannelPtr(0), p);
+    EXPECT_EQ(Bytes(copy->GetChannelPtr(0)), p);
     EXPECT_EQ(copy->GetRowDelta(3), 40);
     EXPECT_EQ(copy->GetOrientation(), 3);
     EXPECT_EQ(copy->GetWidth(), 8);
@@ -454,21 +460,21 @@ TEST(ImageTest, CopiesSharePixelsButNotFormatTexts) {
     EXPECT_NE(copy->GetFormat()->GetOrder(), image->GetFormat()->GetOrder());
     EXPECT_EQ(copy->mList, nullptr);
 
-    *copy->GetPixelPtr(2, 3, 0) = 0x5A;
-    EXPECT_EQ(*image->GetPixelPtr(2, 3, 0), 0x5A) << "one pixel buffer";
+    *Bytes(copy->GetPixelPtr(2, 3, 0)) = 0x5A;
+    EXPECT_EQ(*Bytes(image->GetPixelPtr(2, 3, 0)), 0x5A) << "one pixel buffer";
 
     ImagePtr assigned = MakeImage(kImgFormatUYVY, 16, 1, 1);
     *assigned = *copy;
     EXPECT_EQ(assigned->GetImgFormat(), kImgFormatARGB);
     EXPECT_EQ(assigned->GetChannelType(0), kImgChannelA);
-    EXPECT_EQ(assigned->GetChannelPtr(3), p + 3);
+    EXPECT_EQ(Bytes(assigned->GetChannelPtr(3)), p + 3);
     EXPECT_NE(assigned->GetFormat()->GetOrder(), copy->GetFormat()->GetOrder());
     *assigned = *assigned;
     EXPECT_STREQ(assigned->GetFormat()->GetOrder(), "ARGB");
 
     ulkImage::Delete(copy);  // releases its own text and never the pixels
     EXPECT_STREQ(image->GetFormat()->GetOrder(), "ARGB");
-    EXPECT_EQ(*image->GetPixelPtr(2, 3, 0), 0x5A);
+    EXPECT_EQ(*Bytes(image->GetPixelPtr(2, 3, 0)), 0x5A);
     image->FreeBuffer(p);
 }
 
@@ -477,7 +483,7 @@ TEST(ImageTest, CopiesSharePixelsButNotFormatTexts) {
 TEST(ImageCopyTest, TightImagesCopyEveryByte) {
     ImagePtr from = MakeImage(kImgFormatRGB, 8, 7, 5);
     ImagePtr to = MakeImage(kImgFormatRGB, 8, 7, 5);
-    unsigned char* a = from->CreateBuffer();
+    unsigned char* a = Bytes(from->CreateBuffer());
     GuardedBuffer b(7 * 5 * 3);
     to->SetData(b.data());
     Paint(from.get(), 7);
@@ -491,7 +497,7 @@ TEST(ImageCopyTest, DifferentRowDeltasCopyRowByRow) {
     // Tight source, padded destination: the padding stays untouched.
     ImagePtr from = MakeImage(kImgFormatBGRA, 8, 9, 6);
     ImagePtr to = MakeImage(kImgFormatBGRA, 8, 9, 6);
-    unsigned char* a = from->CreateBuffer();
+    unsigned char* a = Bytes(from->CreateBuffer());
     Paint(from.get(), 9);
     GuardedBuffer b(50 * 6);
     std::memset(b.data(), 0xEE, b.size());
@@ -516,7 +522,7 @@ TEST(ImageCopyTest, DifferentRowDeltasCopyRowByRow) {
 
 TEST(ImageCopyTest, BothPlanesOfAlphaFormats) {
     ImagePtr from = MakeImage(kImgFormatUYVYAlpha, 8, 10, 4);
-    unsigned char* a = from->CreateBuffer();
+    unsigned char* a = Bytes(from->CreateBuffer());
     Paint(from.get(), 5, 2);
     ImagePtr to = MakeImage(kImgFormatUYVYAlpha, 8, 10, 4);
     GuardedBuffer b(32 * 4 + 10 * 4);
@@ -532,7 +538,7 @@ TEST(ImageCopyTest, BothPlanesOfAlphaFormats) {
 TEST(ImageCopyTest, SixteenBitPackedImages) {
     ImagePtr from = MakeImage(kImgFormatYUYV, 16, 6, 3);
     ImagePtr to = MakeImage(kImgFormatYUYV, 16, 6, 3);
-    unsigned char* a = from->CreateBuffer();
+    unsigned char* a = Bytes(from->CreateBuffer());
     for (int i = 0; i < 6 * 3 * 4; ++i) a[i] = static_cast<unsigned char>(i * 3 + 1);
     GuardedBuffer b(6 * 3 * 4);
     to->SetData(b.data());
@@ -563,7 +569,7 @@ TEST(ImageCopyTest, MismatchesAreRefusedAndCopyNothing) {
                           Case{kImgFormatRGBA, 8, 5, 4}, Case{kImgFormatRGBA, 8, 4, 3},
                           Case{kImgFormatRGBA, 8, 8, 8}}) {
         ImagePtr from = MakeImage(c.code, c.bits, c.width, c.height);
-        unsigned char* a = from->CreateBuffer();
+        unsigned char* a = Bytes(from->CreateBuffer());
         Paint(from.get(), c.width);
         EXPECT_FALSE(to->Copy(from.get(), nullptr)) << c.code << " " << c.bits << " " << c.width;
         from->FreeBuffer(a);
@@ -591,7 +597,7 @@ TEST(ImageCopyTest, MismatchesAreRefusedAndCopyNothing) {
 
 TEST(ImageCopyTest, CopyOntoItselfChangesNothing) {
     ImagePtr image = MakeImage(kImgFormatRGB, 8, 3, 3);
-    unsigned char* p = image->CreateBuffer();
+    unsigned char* p = Bytes(image->CreateBuffer());
     Paint(image.get(), 3);
     EXPECT_TRUE(image->Copy(image.get(), nullptr));
     EXPECT_EQ(Mismatches(image.get(), 3), 0);

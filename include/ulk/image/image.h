@@ -85,7 +85,7 @@ class ULK_API ulkImage : public ulkMediaObject {
     /// Bits per sample of the channel.
     int GetChannelSize(int index) const;
     /// Address of the channel's sample in pixel (0, 0).
-    unsigned char* GetChannelPtr(int index) const;
+    void* GetChannelPtr(int index) const;
     /// Bytes between adjacent channels inside one pixel.
     int GetChannelDelta(int index) const;
     /// Bytes from one pixel (one pair, for packed 4:2:2 channels) to the next in a row.
@@ -93,21 +93,21 @@ class ULK_API ulkImage : public ulkMediaObject {
     /// Bytes from one row to the next.
     int GetRowDelta(int index) const;
     /// Start of the row in the channel; the row is not range-checked.
-    unsigned char* GetRowPtr(int row, int channel) const;
+    void* GetRowPtr(int row, int channel) const;
     /// Sample of pixel (x, y) in the channel; null outside the image (for packed 4:2:2
     /// channels x counts pairs, 0 to width / 2 - 1).
-    unsigned char* GetPixelPtr(int x, int y, int channel) const;
+    void* GetPixelPtr(int x, int y, int channel) const;
 
     // --- memory
     /// Row delta of every channel in use, kept by the next SetData only.
     void SetRowDelta(int bytes);
     /// Places the channels in the buffer at data (which stays the caller's).
-    void SetData(unsigned char* data);
+    void SetData(void* data);
     /// A new buffer large enough for every pointer SetData computes, already placed with
     /// SetData; null when memory ran out (the image is then unchanged). Release it with FreeBuffer.
-    unsigned char* CreateBuffer();
+    void* CreateBuffer();
     /// Releases a buffer from CreateBuffer; the image's pointers dangle until the next SetData.
-    void FreeBuffer(unsigned char* buffer);
+    void FreeBuffer(void* buffer);
     /// Copies the pixels of source into this image, plane by plane and row by row, each image
     /// with its own row deltas. False, copying nothing, when source is null, either image has no
     /// data or the two differ in format code, bit depth, width, height or row size. The region
