@@ -5,17 +5,20 @@
 #include <new>
 
 ulkParamKey::ulkParamKey(double time)
-    : mTime(time), mValue(nullptr), mValueSize(0), mUserData(nullptr), mIsActive(false) {}
+    : mValue(nullptr), mValueSize(0), mUserData(nullptr), mIsActive(false) {
+    SetTime(time);
+}
 
 ulkParamKey::~ulkParamKey() {
     delete[] static_cast<unsigned char*>(mValue);
 }
 
-double ulkParamKey::GetTime() const {
+void ulkParamKey::SetTime(double time) {
+    mTime = time;
     // Truncation to whole 0.00000001 steps. Within +-21.47483648 this is exactly
     // the 32-bit integer conversion; beyond it the same truncation still holds
     // instead of an out-of-range integer conversion.
-    return std::trunc(mTime * 100000000.0) / 100000000.0;
+    mKeyTime = std::trunc(time * 100000000.0) / 100000000.0;
 }
 
 bool ulkParamKey::SetValue(const void* source, size_t size) {

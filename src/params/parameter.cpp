@@ -22,18 +22,31 @@ double KeyTime(const ulkList& keys, int index) {
 
 // First index in [first, last) whose key time satisfies pred, or last. The
 // keys stand in time order and pred is false for a prefix and true for the
-// rest, so this gives the same index as a scan from first upward; parameters
-// animated frame by frame hold many keys and are evaluated for every frame.
+// rest, so there is exactly one such boundary and this finds the same index
+// as a scan from first upward. Parameters animated frame by frame hold many
+// keys and are evaluated at neighbouring times one frame after the other, so
+// the boundary found last time and the one after it are tried first; a
+// binary search finds any other.
 template <class Pred>
-int FirstWhere(const ulkList& keys, int first, int last, Pred pred) {
-    while (first < last) {
-        const int middle = first + (last - first) / 2;
-        if (pred(KeyTime(keys, middle)))
-            last = middle;
-        else
-            first = middle + 1;
+int FirstWhere(const ulkList& keys, int first, int last, Pred pred, int& hint) {
+    for (int guess = hint; guess <= hint + 1; ++guess) {
+        if (guess < first || guess > last) continue;
+        if ((guess == last || pred(KeyTime(keys, guess))) &&
+            (guess == first || !pred(KeyTime(keys, guess - 1)))) {
+            hint = guess;
+            return guess;
+        }
     }
-    return first;
+    int low = first, high = last;
+    while (low < high) {
+        const int middle = low + (high - low) / 2;
+        if (pred(KeyTime(keys, middle)))
+            high = middle;
+        else
+            low = middle + 1;
+    }
+    hint = low;
+    return low;
 }
 
 bool ReadChannel(const ulkParamKey* key, int channel, double* value) {
@@ -77,7 +90,8 @@ ulkParameter::ulkParameter(const char* label, const char* id, void* value, size_
       mUserData(nullptr),
       mHidden(false),
       mTouched(false),
-      mInterpolator(sBasicInterpolator) {
+      mInterpolator(sBasicInterpolator),
+      mSearchHint(0) {
     if (value && size > 0) {
         unsigned char* copy = new (std::nothrow) unsigned char[size];
         if (copy) std::memcpy(copy, value, size);
@@ -262,7 +276,8 @@ bool ulkParameter::InterpolateLinear(double time, void* destination, size_t size
     } else if (time > KeyTime(mKeys, count - 1)) {
         if (!ReadChannel(_Key(count - 1), channel, &value)) return false;
     } else {
-        const int i = FirstWhere(mKeys, 1, count, [time](double t) { return t >= time; });
+        const int i = FirstWhere(
+            mKeys, 1, count, [time](double t) { return t >= time; }, mSearchHint);
         const int p = i - 1;
         double ap, ai;
         if (!ReadChannel(_Key(p), channel, &ap) || !ReadChannel(_Key(i), channel, &ai))
@@ -304,8 +319,8 @@ int ulkParameter::GetKeyIndex(double time) const {
     const int count = mKeys.GetCount();
     // The keys within the tolerance of the time form one run in a time-ordered
     // list: find the first key not below the run, then check it is inside.
-    const int index =
-        FirstWhere(mKeys, 0, count, [time](double t) { return t - time > -kKeyTolerance; });
+    const int index = FirstWhere(
+        mKeys, 0, count, [time](double t) { return t - time > -kKeyTolerance; }, mSearchHint);
     if (index < count && std::fabs(KeyTime(mKeys, index) - time) < kKeyTolerance) return index;
     return -1;
 }
@@ -314,14 +329,17 @@ int ulkParameter::GetPrevKey(double time) const {
     const int match = GetKeyIndex(time);
     if (match >= 0) return match - 1;
     // The last key strictly before the time.
-    return FirstWhere(mKeys, 0, mKeys.GetCount(), [time](double t) { return !(t < time); }) - 1;
+    return FirstWhere(
+               mKeys, 0, mKeys.GetCount(), [time](double t) { return !(t < time); }, mSearchHint) -
+           1;
 }
 
 int ulkParameter::GetNextKey(double time) const {
     const int count = mKeys.GetCount();
     const int match = GetKeyIndex(time);
     if (match >= 0) return match + 1 < count ? match + 1 : -1;
-    const int index = FirstWhere(mKeys, 0, count, [time](double t) { return t > time; });
+    const int index = FirstWhere(
+        mKeys, 0, count, [time](double t) { return t > time; }, mSearchHint);
     return index < count ? index : -1;
 }
 

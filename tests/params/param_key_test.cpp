@@ -157,11 +157,17 @@ TEST(ParamKey, SearchesAgreeWithAScanOnManyKeys) {
             probes.push_back(t + d);
     }
     for (int i = 0; i < 2000; ++i) probes.push_back(time(rng));
-    for (double t : probes) {
-        ASSERT_EQ(p->GetKeyIndex(t), ScanIndex(p, t)) << t;
-        ASSERT_EQ(p->GetPrevKey(t), ScanPrev(p, t)) << t;
-        ASSERT_EQ(p->GetNextKey(t), ScanNext(p, t)) << t;
-    }
+    auto check = [&] {
+        for (double t : probes) {
+            ASSERT_EQ(p->GetKeyIndex(t), ScanIndex(p, t)) << t;
+            ASSERT_EQ(p->GetPrevKey(t), ScanPrev(p, t)) << t;
+            ASSERT_EQ(p->GetNextKey(t), ScanNext(p, t)) << t;
+        }
+    };
+    check();
+    // Fewer keys than the last search saw.
+    while (p->GetNumKeys() > 3) p->ClearKey(p->GetNumKeys() / 2);
+    check();
 }
 
 TEST(ParamKey, ChangeClearAndActive) {

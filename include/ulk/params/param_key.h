@@ -26,9 +26,9 @@ class ULK_API ulkParamKey : public ulkNode {
 
     // --- time
     /// The time truncated to a multiple of 0.00000001; every key comparison uses it.
-    double GetTime() const;
+    double GetTime() const { return mKeyTime; }
     /// Stores the time unchanged; the caller keeps the key list in time order.
-    void SetTime(double time) { mTime = time; }
+    void SetTime(double time);
 
     // --- value
     /// The value bytes, or null when the key holds no value.
@@ -57,6 +57,9 @@ class ULK_API ulkParamKey : public ulkNode {
     size_t mValueSize;
     const void* mUserData;
     bool mIsActive;
+
+  private:
+    double mKeyTime;  // mTime truncated, kept because every search compares it
 };
 
 #endif  // ULK_PARAMS_PARAM_KEY_H

@@ -169,6 +169,9 @@ class ULK_API ulkParameter : public ulkNode {
     bool mHidden;
     bool mTouched;
     ulkInterpolator mInterpolator;
+
+  private:
+    mutable int mSearchHint;  // where the last key search ended
 };
 
 #endif  // ULK_PARAMS_PARAMETER_H
