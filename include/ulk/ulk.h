@@ -36,8 +36,15 @@
 #include "ulk/params/group.h"
 
 // Effect models.
+#include "ulk/model/model_description.h"
+#include "ulk/model/host_model.h"
+#include "ulk/model/model.h"
 
 // Effect instances.
+#include "ulk/instance/state.h"
+#include "ulk/instance/render_context.h"
+#include "ulk/instance/host_instance.h"
+#include "ulk/instance/instance.h"
 
 // Overlays.
 #include "ulk/overlay/overlay_context.h"

@@ -1,0 +1,318 @@
+#include "ulk/instance/host_instance.h"
+
+#include <new>
+
+#include "core/process_modes.h"
+#include "ulk/image/image.h"
+#include "ulk/instance/instance.h"
+#include "ulk/model/host_model.h"
+
+namespace {
+
+// Bit of mFlags: the plug-in's PreProcess succeeded and its PostProcess is pending.
+const uint32_t kPreProcessed = 1u;
+
+}  // namespace
+
+ulkHostInstance::ulkHostInstance()
+    : mHostModel(nullptr),
+      mPluginInstance(nullptr),
+      mParameters(4),
+      mInputs(nullptr),
+      mOutputs(nullptr),
+      mNumInputs(0),
+      mNumOutputs(0),
+      mFlags(0),
+      mAborted(false),
+      mFrameRate(0.0),
+      mCurrentFrame(0),
+      mTotalFrames(0),
+      mSegmentedFrames(false),
+      mPixelAspect(1.0),
+      mDisplayAspect(1.0),
+      mQuality(1.0),
+      // The host sets the video type and field topness before it renders;
+      // until then the instance counts whole frames and every field is on top.
+      mVideoType(kVideoTypeProgressive),
+      mFieldMode(kFieldModeFrames),
+      mFieldDominance(kFieldOne),
+      mFieldTopness(kFieldOne),
+      mField(kFieldOne),
+      mNumFields(1),
+      mInstanceType(kInstanceTypeNone),
+      mDrawAllowed(false),
+      mMeterCallback(nullptr),
+      mMeterData(nullptr),
+      mAbortCallback(nullptr),
+      mAbortData(nullptr),
+      mPlatformUIInfo(nullptr),
+      mHasPlatformUIInfo(false),
+      mInstanceData(nullptr),
+      mInstanceDataSize(0),
+      mInstanceDataModified(false),
+      mHostParametersModified(false),
+      mAltFrameBlob(nullptr),
+      mState(ULKState::kStateIdle) {}
+
+ulkHostInstance::~ulkHostInstance() {
+    _DeleteParameters();
+    delete[] mInputs;
+    delete[] mOutputs;
+    delete[] mInstanceData;
+}
+
+// ------------------------------------------------------------------ creation and destruction
+
+ulkHostInstance* ulkHostInstance::New(ulkHostModel* model, ulkInstance_v1* plugin) {
+    if (!model || !plugin) return nullptr;
+    ulkHostInstance* instance = new (std::nothrow) ulkHostInstance;
+    if (!instance) return nullptr;
+
+    instance->mPluginInstance = plugin;
+    plugin->mHostInstance = instance;
+    instance->mHostModel = model;
+    if (!instance->_Init()) {
+        // The plug-in instance goes back to the caller unlinked, not pointing at freed memory.
+        plugin->mHostInstance = nullptr;
+        delete instance;
+        return nullptr;
+    }
+    return instance;
+}
+
+void ulkHostInstance::Delete(ulkHostInstance* instance) {
+    delete instance;
+}
+
+bool ulkHostInstance::_Init() {
+    const int inputs = mHostModel->GetNumInputs();
+    const int outputs = mHostModel->GetNumOutputs();
+    mInputs = new (std::nothrow) ulkMediaObject*[inputs]();
+    mOutputs = new (std::nothrow) ulkMediaObject*[outputs]();
+    if (!mInputs || !mOutputs) return false;
+    mNumInputs = inputs;
+    mNumOutputs = outputs;
+    return true;
+}
+
+void ulkHostInstance::CleanUp() {
+    ResetError();
+    if (mFlags & kPreProcessed) PostProcess();
+}
+
+ulkModel_v1* ulkHostInstance::GetModel() const {
+    return mHostModel->GetModel();
+}
+
+// ------------------------------------------------------------------ media slots
+
+bool ulkHostInstance::SetInput(int index, ulkMediaObject* media) {
+    if (index < 0 || index >= mNumInputs) return false;
+    mInputs[index] = media;
+    return true;
+}
+
+bool ulkHostInstance::SetOutput(int index, ulkMediaObject* media) {
+    if (index < 0 || index >= mNumOutputs) return false;
+    mOutputs[index] = media;
+    return true;
+}
+
+ulkMediaObject* ulkHostInstance::GetInput(int index) const {
+    if (index < 0 || index >= mNumInputs) return nullptr;
+    return mInputs[index];
+}
+
+ulkMediaObject* ulkHostInstance::GetOutput(int index) const {
+    if (index < 0 || index >= mNumOutputs) return nullptr;
+    return mOutputs[index];
+}
+
+ulkImage* ulkHostInstance::_OutputImage() const {
+    return dynamic_cast<ulkImage*>(GetOutput(0));
+}
+
+// ------------------------------------------------------------------ errors
+
+void ulkHostInstance::SetError(ulkErrorStatus status) {
+    mError.ResetError();
+    mError.SetError(status);
+}
+
+// ------------------------------------------------------------------ calls into the plug-in
+
+bool ulkHostInstance::DefineParameters() {
+    ULKState guard(ULKState::kStateDefineParameters, mState);
+    ResetError();
+    mHostModel->SetUp();
+    const bool result = mPluginInstance->DefineParameters();
+    mHostModel->SetDown();
+    return result;
+}
+
+bool ulkHostInstance::HasEffect() {
+    ResetError();
+    mHostModel->SetUp();
+    const bool result = mPluginInstance->HasEffect();
+    mHostModel->SetDown();
+    return result;
+}
+
+bool ulkHostInstance::InPlace() {
+    ResetError();
+    mHostModel->SetUp();
+    const bool result = mPluginInstance->InPlace();
+    mHostModel->SetDown();
+    return result;
+}
+
+bool ulkHostInstance::PreProcess() {
+    ResetError();
+    if (mFlags & kPreProcessed) return true;
+
+    // Modules read the render flag: final rendering (play mode 0) or playback (1).
+    const int32_t playMode = ulk::GetPlayModeValue();
+    if (playMode == kPlayModePlay)
+        ulk::SetRenderFlag(0);
+    else if (playMode == kPlayModeRender)
+        ulk::SetRenderFlag(1);
+
+    mHostModel->SetUp();
+    const bool result = mPluginInstance->PreProcess();
+    mHostModel->SetDown();
+    if (result) {
+        mFlags |= kPreProcessed;
+        return true;
+    }
+    if (mError.GetError() == kErrorNone) mError.SetError(kErrorPreProcess);
+    return false;
+}
+
+void ulkHostInstance::PostProcess() {
+    if (mFlags & kPreProcessed) {
+        mHostModel->SetUp();
+        mPluginInstance->PostProcess();
+        mHostModel->SetDown();
+    }
+    mFlags &= ~kPreProcessed;
+}
+
+bool ulkHostInstance::Execute(const ulkBounds* bounds) {
+    ULKState guard(ULKState::kStateExecute, mState);
+    ResetError();
+    Evaluate();
+    mAborted = false;
+
+    ulkBounds whole;
+    if (!bounds) {
+        const ulkImage* output = _OutputImage();
+        if (!output) {
+            mError.SetError(kErrorExecute);
+            return false;
+        }
+        whole = {0, 0, output->GetWidth() - 1, output->GetHeight() - 1};
+        bounds = &whole;
+    }
+
+    if (!HasEffect()) {
+        if (InPlace()) return true;
+        // Nothing to render: the output is a copy of the input.
+        const ulkImage* input = dynamic_cast<const ulkImage*>(GetInput(0));
+        ulkImage* output = _OutputImage();
+        if (!input || !output || !output->Copy(input, bounds)) {
+            if (mError.GetError() == kErrorNone) mError.SetError(kErrorExecute);
+            return false;
+        }
+        return true;
+    }
+
+    ulk::SetRenderFlag(1);
+    bool preProcessedHere = false;
+    if (!(mFlags & kPreProcessed)) {
+        ulk::SetRenderFlag(0);
+        if (!PreProcess()) {
+            if (mError.GetError() == kErrorNone) mError.SetError(kErrorPreProcess);
+            return false;
+        }
+        preProcessedHere = true;
+        ulk::SetRenderFlag(1);
+    }
+
+    bool result = false;
+    mHostModel->SetUp();
+    try {
+        result = mPluginInstance->Execute(bounds);
+    } catch (...) {
+        SetError(kErrorUnhandledException);
+        result = false;
+    }
+    mHostModel->SetDown();
+
+    if (preProcessedHere) PostProcess();
+
+    if (!result && mError.GetError() == kErrorNone) mError.SetError(kErrorExecute);
+    return result;
+}
+
+bool ulkHostInstance::ShowUIWindow(const ulkBounds* bounds) {
+    ULKState guard(ULKState::kStateShowUIWindow, mState);
+    ResetError();
+    Evaluate();
+    mAborted = false;
+
+    ulkBounds whole;
+    if (!bounds) {
+        const ulkImage* output = _OutputImage();
+        if (!output) return false;
+        whole = {0, 0, output->GetWidth() - 1, output->GetHeight() - 1};
+        bounds = &whole;
+    }
+
+    mDrawAllowed = true;
+    bool result = false;
+    mHostModel->SetUp();
+    try {
+        result = mPluginInstance->ShowUIWindow(bounds);
+    } catch (...) {
+        SetError(kErrorUnhandledException);
+        result = false;
+    }
+    mHostModel->SetDown();
+    mDrawAllowed = false;
+    return result;
+}
+
+void ulkHostInstance::GetInputSize(ulkBounds* bounds) {
+    ResetError();
+    mHostModel->SetUp();
+    mPluginInstance->GetInputSize(bounds);
+    mHostModel->SetDown();
+}
+
+void ulkHostInstance::GetOutputSize(ulkBounds* bounds) {
+    ResetError();
+    mHostModel->SetUp();
+    mPluginInstance->GetOutputSize(bounds);
+    mHostModel->SetDown();
+}
+
+// ------------------------------------------------------------------ abort and meter
+
+void ulkHostInstance::SetAbortCallback(ulkAbortCallback callback, void* data) {
+    mAbortCallback = callback;
+    mAbortData = data;
+}
+
+void ulkHostInstance::SetMeterCallback(ulkMeterCallback callback, void* data) {
+    mMeterCallback = callback;
+    mMeterData = data;
+}
+
+bool ulkHostInstance::Aborted() {
+    if (mAbortCallback) {
+        mHostModel->SetDown();
+        mAborted = mAbortCallback(mPluginInstance, mAbortData);
+        mHostModel->SetUp();
+    }
+    return mAborted;
+}
