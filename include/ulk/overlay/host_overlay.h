@@ -83,12 +83,19 @@ class ULK_API ulkHostOverlay {
     // --- events (false and nothing done without a plug-in overlay)
     /// Asks the plug-in to draw; the argument's meaning is the host's.
     void Draw(bool flag);
+    /// A button went down at (x, y); true when the plug-in handled it.
     bool OnMouseDown(double x, double y, uint32_t flags);
+    /// The mouse moved with a button down; true when handled.
     bool OnMouseMove(double x, double y, uint32_t flags);
+    /// The button went up; true when handled.
     bool OnMouseUp(double x, double y, uint32_t flags);
+    /// The mouse moved with no button down; true when handled.
     bool OnMouseOver(double x, double y, uint32_t flags);
+    /// The mouse rests at (x, y); true when handled.
     bool OnMouseIdle(double x, double y, uint32_t flags);
+    /// A key went down; true when handled.
     bool OnKeyDown(int key, uint32_t flags);
+    /// A key went up; true when handled.
     bool OnKeyUp(int key, uint32_t flags);
     /// Tells the plug-in the context's native window changed.
     void OnNewNativeWindow();
@@ -141,8 +148,11 @@ class ULK_API ulkHostOverlay {
     void SetPluginError(const char* text) { mError.SetPluginError(text); }
     /// Status kErrorPluginWarning with the plug-in's text.
     void SetPluginWarning(const char* text) { mError.SetPluginWarning(text); }
+    /// The current status.
     ulkErrorStatus GetError() { return mError.GetError(); }
+    /// The text for the current status (see ulkError::GetErrorString).
     const char* GetErrorString() const { return mError.GetErrorString(); }
+    /// The whole record.
     const ulkError* GetErrorObj() { return &mError; }
 
     ulkBaseOverlayContext* mContext;

@@ -48,8 +48,11 @@ class ULK_API ulkOverlay_v1 {
     // --- drawing and events (the meaning of coordinates, flags and keys is the host's)
     /// Draws the overlay, usually into GetOverlayBuffer().
     virtual void Draw(bool flag) = 0;
+    /// A button went down at (x, y); answer true when handled.
     virtual bool OnMouseDown(double x, double y, uint32_t flags) = 0;
+    /// The mouse moved with a button down.
     virtual bool OnMouseMove(double x, double y, uint32_t flags) = 0;
+    /// The button went up.
     virtual bool OnMouseUp(double x, double y, uint32_t flags) = 0;
     /// False here.
     virtual bool OnMouseOver(double x, double y, uint32_t flags);
@@ -67,7 +70,9 @@ class ULK_API ulkOverlay_v1 {
     virtual void DefineOverlay();
 
     // --- the surface
+    /// The platform window the overlay is shown in.
     void* GetNativeWindow();
+    /// The surface's OpenGL context, or null.
     void* GetOpenGLContext();
     /// The rectangle of the video on the surface.
     void GetVidRect(ulkBounds& rect);
@@ -86,14 +91,21 @@ class ULK_API ulkOverlay_v1 {
     int GetMode();
 
     // --- host memory
+    /// size bytes from the host's overlay allocator; null (status 10 or 7) when it gave none.
     void* AllocMem(size_t size);
+    /// Gives memory from AllocMem back.
     void FreeMem(void* block);
 
     // --- errors, recorded in the host overlay
+    /// Replaces the record with status.
     void SetError(ulkErrorStatus status);
+    /// Records an error with the plug-in's own text.
     void SetPluginError(const char* text);
+    /// Records a warning with the plug-in's own text.
     void SetPluginWarning(const char* text);
+    /// The current status.
     ulkErrorStatus GetError();
+    /// The text for the current status.
     const char* GetErrorString() const;
 
     /// The host-side twin; set by ulkHostModel::NewOverlay.
