@@ -1,0 +1,10 @@
+# The README shows the example plug-in and host in full; fail when they drift apart.
+file(READ ${ROOT}/README.md readme)
+foreach(example examples/minimal_plugin/fade.cpp examples/minimal_host/host.cpp)
+  file(READ ${ROOT}/${example} code)
+  string(STRIP "${code}" code)
+  string(FIND "${readme}" "```cpp\n${code}\n```" at)
+  if(at EQUAL -1)
+    message(FATAL_ERROR "README.md does not show ${example} as it is")
+  endif()
+endforeach()
