@@ -159,19 +159,11 @@ TEST(HostOverlay, MemoryCallbacksReportIntoTheRecord) {
     overlay.FreeMem(nullptr);  // null is not passed on
     EXPECT_EQ(gFreed, nullptr);
     EXPECT_EQ(overlay.GetError(), kErrorNone);
-    ulkHostOverlay::SetAllocCallback(nullptr);
-    ulkHostOverlay::SetFreeCallback(nullptr);
-}
 
-TEST(HostOverlay, ErrorOperations) {
-    ulkHostOverlay overlay;
-    EXPECT_EQ(overlay.GetError(), kErrorNone);
-    overlay.SetPluginWarning("careful");
-    EXPECT_EQ(overlay.GetError(), kErrorPluginWarning);
-    EXPECT_STREQ(overlay.GetErrorString(), "careful");
-    overlay.SetError(kErrorGeneric);  // resets, then sets
-    EXPECT_EQ(overlay.GetError(), kErrorGeneric);
-    EXPECT_STREQ(overlay.GetErrorObj()->mPluginWarning, ulkError::GetMessage(kErrorPluginWarning));
+    overlay.SetError(kErrorGeneric);  // resets the texts, then sets the status
+    EXPECT_STREQ(overlay.GetErrorObj()->mPluginError, ulkError::GetMessage(kErrorPlugin));
     overlay.GetMode();  // an ordinary operation starts from a clean record
     EXPECT_EQ(overlay.GetError(), kErrorNone);
+    ulkHostOverlay::SetAllocCallback(nullptr);
+    ulkHostOverlay::SetFreeCallback(nullptr);
 }
