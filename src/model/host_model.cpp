@@ -103,12 +103,23 @@ bool ulkHostModel::Open(unsigned char startUpFlag, hostAppInfo* info) {
     mULKVersion = 1.0f;
     mModel->mHostModel = this;
 
-    if (!DefineIdentity() || !mName || mType == kPluginTypeNone) {
+    bool identified = false;
+    bool described = false;
+    try {
+        identified = DefineIdentity() && mName && mType != kPluginTypeNone;
+        described = identified && DefineEffect();
+    } catch (...) {
+        // The exception is the plug-in's to report, but a half-defined model must
+        // not stay open: a later Open would take it for a working one.
+        _Release();
+        throw;
+    }
+    if (!identified) {
         if (mError.GetError() == kErrorNone) mError.SetError(kErrorDefineIdentity);
         _Release();
         return false;
     }
-    if (!DefineEffect()) {
+    if (!described) {
         if (mError.GetError() == kErrorNone) mError.SetError(kErrorDefineEffect);
         _Release();
         return false;

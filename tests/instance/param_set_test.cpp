@@ -1,5 +1,7 @@
 // The parameter set of an instance: what the "Levels" plug-in defines, how
 // the host walks and keys it, and how Execute hands the plug-in its values.
+#include <memory>
+
 #include "../plugins/param_probe/param_probe.h"
 #include "model_host.h"
 
@@ -9,24 +11,25 @@ class ParamSetTest : public ModelHostTest {
   protected:
     void SetUp() override {
         ModelHostTest::SetUp();
-        ASSERT_TRUE(mModel.Open(TestPluginPath("param_probe").c_str(), 0, nullptr));
-        auto getRecord = ModuleSymbol<ParamProbeRecordProc>(mModel, "ParamProbeGetRecord");
+        ASSERT_TRUE(mModel->Open(TestPluginPath("param_probe").c_str(), 0, nullptr));
+        auto getRecord = ModuleSymbol<ParamProbeRecordProc>(*mModel, "ParamProbeGetRecord");
         ASSERT_NE(getRecord, nullptr);
         mRecord = getRecord();
         *mRecord = ParamProbeRecord();
-        mInstance = mModel.NewInstance();
-        ASSERT_NE(mInstance, nullptr) << mModel.GetErrorString();
+        mInstance = mModel->NewInstance();
+        ASSERT_NE(mInstance, nullptr) << mModel->GetErrorString();
     }
 
     void TearDown() override {
-        if (mInstance) mModel.DeleteInstance(mInstance);
-        mModel.Close();
+        if (mInstance) mModel->DeleteInstance(mInstance);
+        mModel.reset();
         ModelHostTest::TearDown();
     }
 
     ulkParameter* Find(const char* id) const { return mInstance->FindParameter(id); }
 
-    ulkHostModel mModel{0};
+    // Destroyed in TearDown, while the model's memory callbacks are still installed.
+    std::unique_ptr<ulkHostModel> mModel = std::make_unique<ulkHostModel>(0);
     ParamProbeRecord* mRecord = nullptr;
     ulkHostInstance* mInstance = nullptr;
 };
@@ -151,7 +154,7 @@ TEST_F(ParamSetTest, ModelWideCallbacksReceiveThePluginInstance) {
     EXPECT_FALSE(mInstance->HasFlushInstanceDataCallback());
     EXPECT_FALSE(mInstance->FlushInstanceData());
 
-    mModel.SetUpdateParamsCallback(nullptr);
+    mModel->SetUpdateParamsCallback(nullptr);
     EXPECT_FALSE(mInstance->HasUpdateParamsCallback());
     EXPECT_FALSE(mInstance->UpdateParams());
     EXPECT_EQ(mRecord->updates, 1);

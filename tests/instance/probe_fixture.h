@@ -3,6 +3,7 @@
 #ifndef ULK_TESTS_PROBE_FIXTURE_H
 #define ULK_TESTS_PROBE_FIXTURE_H
 
+#include <memory>
 #include <string>
 
 #include "../plugins/instance_probe/probe_control.h"
@@ -12,14 +13,14 @@ class ProbeTest : public ModelHostTest {
   protected:
     void SetUp() override {
         ModelHostTest::SetUp();
-        ASSERT_TRUE(mModel.Open(TestPluginPath("instance_probe").c_str(), 0, nullptr));
-        auto getControl = ModuleSymbol<ProbeGetControlProc>(mModel, "ProbeGetControl");
-        mRenderFlag = ModuleSymbol<ProbeRenderFlagProc>(mModel, "ProbeRenderFlag");
+        ASSERT_TRUE(mModel->Open(TestPluginPath("instance_probe").c_str(), 0, nullptr));
+        auto getControl = ModuleSymbol<ProbeGetControlProc>(*mModel, "ProbeGetControl");
+        mRenderFlag = ModuleSymbol<ProbeRenderFlagProc>(*mModel, "ProbeRenderFlag");
         ASSERT_NE(getControl, nullptr);
         ASSERT_NE(mRenderFlag, nullptr);
         mControl = getControl();
         *mControl = ProbeControl();
-        mInstance = mModel.NewInstance();
+        mInstance = mModel->NewInstance();
         ASSERT_NE(mInstance, nullptr);
         mIn.FillPattern(3);
         mOut.Fill(0);
@@ -28,8 +29,8 @@ class ProbeTest : public ModelHostTest {
     }
 
     void TearDown() override {
-        if (mInstance) mModel.DeleteInstance(mInstance);
-        mModel.Close();
+        if (mInstance) mModel->DeleteInstance(mInstance);
+        mModel.reset();
         ModelHostTest::TearDown();
     }
 
@@ -44,7 +45,8 @@ class ProbeTest : public ModelHostTest {
     /// The render flag the module reads right now.
     int32_t RenderFlag() const { return mRenderFlag(); }
 
-    ulkHostModel mModel{kProbeModel};
+    // Destroyed in TearDown, while the model's memory callbacks are still installed.
+    std::unique_ptr<ulkHostModel> mModel = std::make_unique<ulkHostModel>(kProbeModel);
     ProbeControl* mControl = nullptr;
     ProbeRenderFlagProc mRenderFlag = nullptr;
     ulkHostInstance* mInstance = nullptr;

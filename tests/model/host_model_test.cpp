@@ -134,6 +134,17 @@ TEST_F(HostModelTest, IdentityFailuresReportThePluginsStatusOrDefineIdentity) {
     }
 }
 
+TEST_F(HostModelTest, ThrowingDefinitionPassesOnAndLeavesTheModelClosed) {
+    ulkHostModel model(kFaultEffectThrows);
+    EXPECT_THROW(model.Open(Faults().c_str(), 0, nullptr), std::runtime_error);
+    EXPECT_EQ(model.GetModel(), nullptr);
+    EXPECT_EQ(model.GetDLL(), nullptr);
+    EXPECT_EQ(model.GetNumFormats(), 0);
+    EXPECT_EQ(ulkDLLMaker::GetNumLoaded(), 0);
+    // Not taken for open: the next Open defines the model again and fails the same way.
+    EXPECT_THROW(model.Open(0, nullptr), std::runtime_error);
+}
+
 TEST_F(HostModelTest, OpenDefinesTheModelAndKeepsItOpen) {
     ulkHostModel model(0);
     ASSERT_TRUE(model.Open(Effects().c_str(), 0, nullptr));

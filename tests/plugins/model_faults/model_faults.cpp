@@ -63,6 +63,7 @@ class FaultyModel : public ulkModel_v1 {
         }
     }
     bool DefineEffect() override {
+        if (mBehaviour == kFaultEffectThrows) throw std::runtime_error("effect");
         if (mBehaviour == kFaultEffectWarning) {
             SetPluginWarning(FAULT_EFFECT_TEXT);
             return false;
@@ -96,7 +97,7 @@ class PlainModel : public ulkModel_v1 {
 }  // namespace
 
 ULK_PLUGIN_EXPORT int ulkNumModels_v1(void) {
-    return kFaultPlain + 1;
+    return kFaultEffectThrows + 1;
 }
 
 ULK_PLUGIN_EXPORT void ulkSetAttribute(int, int32_t attribute, void*, void*) {

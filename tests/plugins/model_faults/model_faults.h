@@ -17,7 +17,8 @@ enum FaultModel {
     kFaultParamsError = 10,   // DefineParameters records a plug-in error, false
     kFaultParamsThrow = 11,   // DefineParameters throws
     kFaultWithUI = 12,        // a working filter with a user interface and an init string
-    kFaultPlain = 13          // a working filter with every default
+    kFaultPlain = 13,         // a working filter with every default
+    kFaultEffectThrows = 14   // DefineEffect throws
 };
 
 // Texts the faulty models record.
