@@ -19,10 +19,6 @@ TEST_F(GeneratorTest, IsATitleWithOneOutputAndNoInput) {
     EXPECT_EQ(generator.model().GetType(), kPluginTypeTitle);
     EXPECT_EQ(generator.model().GetNumInputs(), 0);
     EXPECT_EQ(generator.model().GetNumOutputs(), 1);
-    ulkPList* pattern = generator.Param<ulkPList>("pattern");
-    ASSERT_NE(pattern, nullptr);
-    EXPECT_EQ(pattern->GetNumItems(), 3);
-    ASSERT_NE(generator.Param<ulkPString>("text"), nullptr);
     // The text settings are grouped.
     ulkParameter* group = generator.instance()->FindParameter("text_group");
     ASSERT_NE(group, nullptr);
