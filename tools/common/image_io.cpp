@@ -35,53 +35,53 @@ bool ReadImageUnguarded(const std::string& path, Frame* frame, std::string* erro
         *error = Failure(path, "cannot read image", OIIO::geterror());
         return false;
     }
-    const OIIO::ImageSpec& spec = input->spec();
-    if (spec.deep) {
+    const OIIO::ImageSpec& header = input->spec();
+    if (header.deep) {
         *error = path + ": deep images are not supported";
         return false;
     }
-    if (spec.depth > 1) {
+    if (header.depth > 1) {
         *error = path + ": volume images are not supported";
         return false;
     }
-    if (spec.nchannels < 1) {
+    if (header.nchannels < 1) {
         *error = path + ": image has no channels";
         return false;
     }
-    if (spec.width < 1 || spec.height < 1 || spec.width > kMaxFrameSide ||
-        spec.height > kMaxFrameSide || spec.nchannels > 64) {
-        *error = path + ": unsupported image size " + SizeText(spec.width, spec.height) + " with " +
-                 std::to_string(spec.nchannels) + " channels";
+    if (header.width < 1 || header.height < 1 || header.width > kMaxFrameSide ||
+        header.height > kMaxFrameSide || header.nchannels > 64) {
+        *error = path + ": unsupported image size " + SizeText(header.width, header.height) + " with " +
+                 std::to_string(header.nchannels) + " channels";
         return false;
     }
     // A corrupt header can claim any size; refuse what no real frame needs before allocating.
-    if (static_cast<uint64_t>(spec.width) * spec.height * spec.nchannels > (uint64_t{1} << 31)) {
-        *error = path + ": image too large (" + SizeText(spec.width, spec.height) + " with " +
-                 std::to_string(spec.nchannels) + " channels)";
+    if (static_cast<uint64_t>(header.width) * header.height * header.nchannels > (uint64_t{1} << 31)) {
+        *error = path + ": image too large (" + SizeText(header.width, header.height) + " with " +
+                 std::to_string(header.nchannels) + " channels)";
         return false;
     }
 
     // Colour comes from the first three channels (or the one grey channel); alpha from the
     // channel the reader names as alpha, or the second of two channels.
-    const int channels = spec.nchannels;
-    int alpha = spec.alpha_channel;
+    const int channels = header.nchannels;
+    int alpha = header.alpha_channel;
     if (alpha < 0 && channels == 2) alpha = 1;
     if (alpha >= channels) alpha = -1;
     const bool grey = channels < 3 || (alpha >= 0 && alpha < 3);
 
-    std::vector<uint8_t> samples(static_cast<size_t>(spec.width) * spec.height * channels);
+    std::vector<uint8_t> samples(static_cast<size_t>(header.width) * header.height * channels);
     if (!input->read_image(0, 0, 0, channels, OIIO::TypeDesc::UINT8, samples.data())) {
         *error = Failure(path, "cannot read pixels", input->geterror());
         return false;
     }
-    if (!frame->Allocate(spec.width, spec.height)) {
-        *error = path + ": out of memory for " + SizeText(spec.width, spec.height);
+    if (!frame->Allocate(header.width, header.height)) {
+        *error = path + ": out of memory for " + SizeText(header.width, header.height);
         return false;
     }
     const uint8_t* src = samples.data();
-    for (int y = 0; y < spec.height; ++y) {
+    for (int y = 0; y < header.height; ++y) {
         uint8_t* dst = frame->Row(y);
-        for (int x = 0; x < spec.width; ++x, src += channels, dst += 4) {
+        for (int x = 0; x < header.width; ++x, src += channels, dst += 4) {
             dst[0] = src[0];
             dst[1] = grey ? src[0] : src[1];
             dst[2] = grey ? src[0] : src[2];
@@ -104,9 +104,9 @@ bool WriteImageUnguarded(const std::string& path, const Frame& frame, std::strin
     }
     const bool keepAlpha = output->supports("alpha");
     const int channels = keepAlpha ? 4 : 3;
-    OIIO::ImageSpec spec(frame.Width(), frame.Height(), channels, OIIO::TypeDesc::UINT8);
-    spec.attribute("oiio:UnassociatedAlpha", 1);
-    if (!keepAlpha) spec.alpha_channel = -1;
+    OIIO::ImageSpec layout(frame.Width(), frame.Height(), channels, OIIO::TypeDesc::UINT8);
+    header.attribute("oiio:UnassociatedAlpha", 1);
+    if (!keepAlpha) header.alpha_channel = -1;
 
     std::vector<uint8_t> rgb;
     const void* pixels = frame.Data();
@@ -129,7 +129,7 @@ bool WriteImageUnguarded(const std::string& path, const Frame& frame, std::strin
     }
 
     const std::string temporary = TemporaryPathFor(path);
-    if (!output->open(temporary, spec)) {
+    if (!output->open(temporary, layout)) {
         *error = Failure(path, "cannot create image", output->geterror());
         std::remove(temporary.c_str());
         return false;
