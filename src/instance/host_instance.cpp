@@ -12,6 +12,30 @@ namespace {
 // Bit of mFlags: the plug-in's PreProcess succeeded and its PostProcess is pending.
 const uint32_t kPreProcessed = 1u;
 
+// Runs one call into plug-in code inside the module's environment. An exception
+// leaves without the closing SetDown, on its way to the host's caller.
+template <typename Call>
+bool InModule(ulkHostModel* model, Call call) {
+    model->SetUp();
+    const bool result = call();
+    model->SetDown();
+    return result;
+}
+
+// The same for the plug-in's Execute and ShowUIWindow, where an exception of
+// any type is trapped: status 23 on the instance, answer false.
+template <typename Call>
+bool Trapped(ulkHostInstance* instance, ulkHostModel* model, Call call) {
+    return InModule(model, [&] {
+        try {
+            return call();
+        } catch (...) {
+            instance->SetError(kErrorUnhandledException);
+            return false;
+        }
+    });
+}
+
 }  // namespace
 
 ulkHostInstance::ulkHostInstance()
@@ -144,26 +168,17 @@ void ulkHostInstance::SetError(ulkErrorStatus status) {
 bool ulkHostInstance::DefineParameters() {
     ULKState guard(ULKState::kStateDefineParameters, mState);
     ResetError();
-    mHostModel->SetUp();
-    const bool result = mPluginInstance->DefineParameters();
-    mHostModel->SetDown();
-    return result;
+    return InModule(mHostModel, [this] { return mPluginInstance->DefineParameters(); });
 }
 
 bool ulkHostInstance::HasEffect() {
     ResetError();
-    mHostModel->SetUp();
-    const bool result = mPluginInstance->HasEffect();
-    mHostModel->SetDown();
-    return result;
+    return InModule(mHostModel, [this] { return mPluginInstance->HasEffect(); });
 }
 
 bool ulkHostInstance::InPlace() {
     ResetError();
-    mHostModel->SetUp();
-    const bool result = mPluginInstance->InPlace();
-    mHostModel->SetDown();
-    return result;
+    return InModule(mHostModel, [this] { return mPluginInstance->InPlace(); });
 }
 
 bool ulkHostInstance::PreProcess() {
@@ -177,10 +192,7 @@ bool ulkHostInstance::PreProcess() {
     else if (playMode == kPlayModeRender)
         ulk::SetRenderFlag(1);
 
-    mHostModel->SetUp();
-    const bool result = mPluginInstance->PreProcess();
-    mHostModel->SetDown();
-    if (result) {
+    if (InModule(mHostModel, [this] { return mPluginInstance->PreProcess(); })) {
         mFlags |= kPreProcessed;
         return true;
     }
@@ -238,15 +250,8 @@ bool ulkHostInstance::Execute(const ulkBounds* bounds) {
         ulk::SetRenderFlag(1);
     }
 
-    bool result = false;
-    mHostModel->SetUp();
-    try {
-        result = mPluginInstance->Execute(bounds);
-    } catch (...) {
-        SetError(kErrorUnhandledException);
-        result = false;
-    }
-    mHostModel->SetDown();
+    const bool result =
+        Trapped(this, mHostModel, [&] { return mPluginInstance->Execute(bounds); });
 
     if (preProcessedHere) PostProcess();
 
@@ -269,15 +274,8 @@ bool ulkHostInstance::ShowUIWindow(const ulkBounds* bounds) {
     }
 
     mDrawAllowed = true;
-    bool result = false;
-    mHostModel->SetUp();
-    try {
-        result = mPluginInstance->ShowUIWindow(bounds);
-    } catch (...) {
-        SetError(kErrorUnhandledException);
-        result = false;
-    }
-    mHostModel->SetDown();
+    const bool result =
+        Trapped(this, mHostModel, [&] { return mPluginInstance->ShowUIWindow(bounds); });
     mDrawAllowed = false;
     return result;
 }

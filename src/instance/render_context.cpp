@@ -5,6 +5,7 @@
 #include <limits>
 #include <new>
 
+#include "core/class_memory.h"
 #include "ulk/instance/host_instance.h"
 #include "ulk/model/host_model.h"
 
@@ -100,22 +101,12 @@ void ulkHostInstance::FreeInstanceData() {
 
 void* ulkHostInstance::AllocMem(size_t size) {
     ResetError();
-    if (!mAllocCallback) {
-        mError.SetError(kErrorNullCallback);
-        return nullptr;
-    }
-    void* p = mAllocCallback(size);
-    if (!p) mError.SetError(kErrorOutOfMemory);
-    return p;
+    return ulk::AllocReporting(mAllocCallback, size, mError);
 }
 
 void ulkHostInstance::FreeMem(void* p) {
     ResetError();
-    if (!mFreeCallback) {
-        mError.SetError(kErrorNullCallback);
-        return;
-    }
-    if (p) mFreeCallback(p);
+    ulk::FreeReporting(mFreeCallback, p, mError);
 }
 
 int ulkHostInstance::ConsolePrintf(const char* text) {

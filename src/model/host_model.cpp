@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "core/class_memory.h"
 #include "ulk/instance/host_instance.h"
 #include "ulk/instance/instance.h"
 #include "ulk/model/model.h"
@@ -278,19 +279,9 @@ void ulkHostModel::SetError(ulkErrorStatus status) {
 }
 
 void* ulkHostModel::AllocMem(size_t size) {
-    if (!mAllocCallback) {
-        mError.SetError(kErrorNullCallback);
-        return nullptr;
-    }
-    void* p = mAllocCallback(size);
-    if (!p) mError.SetError(kErrorOutOfMemory);
-    return p;
+    return ulk::AllocReporting(mAllocCallback, size, mError);
 }
 
 void ulkHostModel::FreeMem(void* p) {
-    if (!mFreeCallback) {
-        mError.SetError(kErrorNullCallback);
-        return;
-    }
-    if (p) mFreeCallback(p);
+    ulk::FreeReporting(mFreeCallback, p, mError);
 }

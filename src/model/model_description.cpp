@@ -7,6 +7,25 @@
 
 namespace {
 
+// Appends a new input or output description to list; false with status 8 when
+// it cannot be made or listed (the record is reset first).
+bool AddObjectInfo(ulkList& list, ulkError& error, int number, const char* name, const char* id,
+                   ulkDataType type, unsigned char optional) {
+    error.ResetError();
+    ulkObjectInfo* info = new (std::nothrow) ulkObjectInfo;
+    if (info) {
+        info->SetNumber(number);
+        info->SetName(name);
+        info->SetID(id);
+        info->SetDataType(type);
+        info->SetOptional(optional);
+        if (list.AddTail(info)) return true;
+        delete info;
+    }
+    if (error.GetError() == kErrorNone) error.SetError(kErrorObjectCreation);
+    return false;
+}
+
 char* CopyText(const char* text) {
     if (!text) return nullptr;
     const size_t size = std::strlen(text) + 1;
@@ -91,42 +110,11 @@ bool ulkHostModel::AcceptsFormat(ulkImgFormat format) const {
 
 bool ulkHostModel::AddInput(int number, const char* name, const char* id, ulkDataType type,
                             unsigned char optional) {
-    mError.ResetError();
-    ulkObjectInfo* info = new (std::nothrow) ulkObjectInfo;
-    if (!info) {
-        if (mError.GetError() == kErrorNone) mError.SetError(kErrorObjectCreation);
-        return false;
-    }
-    info->SetNumber(number);
-    info->SetName(name);
-    info->SetID(id);
-    info->SetDataType(type);
-    info->SetOptional(optional);
-    if (!mInputs.AddTail(info)) {
-        delete info;
-        if (mError.GetError() == kErrorNone) mError.SetError(kErrorObjectCreation);
-        return false;
-    }
-    return true;
+    return AddObjectInfo(mInputs, mError, number, name, id, type, optional);
 }
 
 bool ulkHostModel::AddOutput(int number, const char* name, const char* id, ulkDataType type) {
-    mError.ResetError();
-    ulkObjectInfo* info = new (std::nothrow) ulkObjectInfo;
-    if (!info) {
-        if (mError.GetError() == kErrorNone) mError.SetError(kErrorObjectCreation);
-        return false;
-    }
-    info->SetNumber(number);
-    info->SetName(name);
-    info->SetID(id);
-    info->SetDataType(type);
-    if (!mOutputs.AddTail(info)) {
-        delete info;
-        if (mError.GetError() == kErrorNone) mError.SetError(kErrorObjectCreation);
-        return false;
-    }
-    return true;
+    return AddObjectInfo(mOutputs, mError, number, name, id, type, 0);
 }
 
 const ulkObjectInfo* ulkHostModel::GetInputInfo(int index) const {

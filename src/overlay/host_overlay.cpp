@@ -2,6 +2,7 @@
 
 #include <new>
 
+#include "core/class_memory.h"
 #include "core/text.h"
 #include "ulk/image/image.h"
 #include "ulk/image/image_format.h"
@@ -214,21 +215,11 @@ void ulkHostOverlay::GetModeName(int index, char* buffer, int size) {
 // ------------------------------------------------------------------ memory and errors
 
 void* ulkHostOverlay::AllocMem(size_t size) {
-    if (!mAllocCallback) {
-        mError.SetError(kErrorNullCallback);
-        return nullptr;
-    }
-    void* block = mAllocCallback(size);
-    if (!block) mError.SetError(kErrorOutOfMemory);
-    return block;
+    return ulk::AllocReporting(mAllocCallback, size, mError);
 }
 
 void ulkHostOverlay::FreeMem(void* block) {
-    if (!mFreeCallback) {
-        mError.SetError(kErrorNullCallback);
-        return;
-    }
-    if (block) mFreeCallback(block);
+    ulk::FreeReporting(mFreeCallback, block, mError);
 }
 
 void ulkHostOverlay::SetError(ulkErrorStatus status) {
