@@ -95,7 +95,8 @@ int FindModel(const std::string& path, const std::string& selector, std::string*
     std::string names;
     for (int i = 0; i < count; ++i) {
         ulkHostModel model(static_cast<short>(i));
-        if (!model.Open(path.c_str(), 0, nullptr)) continue;
+        std::string ignored;
+        if (!OpenModel(&model, path, &ignored)) continue;
         const char* name = model.GetName();
         const char* id = model.GetIdentifier();
         if ((name && strcasecmp(name, selector.c_str()) == 0) || (id && selector == id)) return i;
@@ -104,6 +105,22 @@ int FindModel(const std::string& path, const std::string& selector, std::string*
     *error = path + ": no model named '" + selector + "'" +
              (names.empty() ? std::string() : " (it has: " + names + ")");
     return -1;
+}
+
+bool OpenModel(ulkHostModel* model, const std::string& path, std::string* error) {
+    dlerror();
+    // The library lets exceptions from the plug-in's definitions pass.
+    try {
+        if (model->Open(path.c_str(), 0, nullptr)) return true;
+        *error = ModelErrorText(*model);
+    } catch (const std::exception& e) {
+        *error = std::string("the plug-in threw while opening the model: ") + e.what();
+    } catch (const char* text) {
+        *error = std::string("the plug-in threw while opening the model: ") + text;
+    } catch (...) {
+        *error = "the plug-in threw while opening the model";
+    }
+    return false;
 }
 
 ulkHostInstance* NewInstanceOf(ulkHostModel* model, std::string* thrown) {
@@ -143,9 +160,8 @@ Effect::~Effect() {
 bool Effect::Open(const std::string& path, int modelIndex, std::string* error) {
     mIndex = modelIndex;
     mModel = std::make_unique<ulkHostModel>(static_cast<short>(modelIndex));
-    dlerror();
-    if (!mModel->Open(path.c_str(), 0, nullptr)) {
-        *error = path + ": " + ModelErrorText(*mModel);
+    if (!OpenModel(mModel.get(), path, error)) {
+        *error = path + ": " + *error;
         mModel.reset();
         return false;
     }

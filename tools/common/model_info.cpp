@@ -18,10 +18,7 @@ std::string Text(const char* text) {
 
 void DescribeModel(const std::string& path, ModelInfo* info) {
     ulkHostModel model(static_cast<short>(info->index));
-    if (!model.Open(path.c_str(), 0, nullptr)) {
-        info->error = ModelErrorText(model);
-        return;
-    }
+    if (!OpenModel(&model, path, &info->error)) return;
     info->name = Text(model.GetName());
     info->vendor = Text(model.GetVendor());
     info->category = Text(model.GetCategory());

@@ -212,6 +212,13 @@ bool RenderFrame(const Job& job, Worker* worker, int frame, const std::vector<Fr
                  " failed: " + instance->GetErrorString();
         return false;
     }
+    // An in-place effect with nothing to do leaves the picture to the host: its input is
+    // the output then.
+    if (!job.sources.empty() && !instance->HasEffect() && instance->InPlace() &&
+        !worker->output.Image()->Copy(worker->inputs[0]->Image(), nullptr)) {
+        *error = "frame " + std::to_string(frame) + ": cannot pass the input through";
+        return false;
+    }
     if (!CopyImageToFrame(*worker->output.Image(), &worker->result, error)) {
         *error = "frame " + std::to_string(frame) + ": " + *error;
         return false;

@@ -39,6 +39,10 @@ void SplitEffectSpec(const std::string& spec, std::string* path, std::string* se
 /// its identifier; model 0 for an empty selector. -1 with a message when none matches.
 int FindModel(const std::string& path, const std::string& selector, std::string* error);
 
+/// model->Open(path), with the reason of a failure, an exception thrown by the plug-in
+/// included, in error.
+bool OpenModel(ulkHostModel* model, const std::string& path, std::string* error);
+
 /// model->NewInstance(), with an exception thrown by the plug-in turned into a message in
 /// thrown (null is then answered).
 ulkHostInstance* NewInstanceOf(ulkHostModel* model, std::string* thrown);
