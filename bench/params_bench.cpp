@@ -1,9 +1,12 @@
 // Parameter evaluation as a host does it for every frame, against the number
-// of keys, and building a long animation key by key.
+// of keys; an instance's 32 parameters evaluated at once, through a real
+// module; and building a long animation key by key.
 #include <benchmark/benchmark.h>
 
 #include <cstdint>
 
+#include "bench_host.h"
+#include "bench_main.h"
 #include "ulk/ulk.h"
 
 namespace {
@@ -69,5 +72,37 @@ void BM_AddKeysInTimeOrder(benchmark::State& state) {
     }
 }
 BENCHMARK(BM_AddKeysInTimeOrder)->Arg(100000)->Unit(benchmark::kMillisecond);
+
+// Every parameter of an instance at a time between keys, as ulkHostInstance::Execute
+// does before it calls the plug-in: the benchmark module's 32 real numbers, each
+// with 5 keys, evaluated frame after frame of a 250-frame shot.
+void BM_InstanceEvaluate(benchmark::State& state) {
+    ulk_bench::InstallHostServices();
+    ulk_bench::Effect effect(ulk_bench::BenchPluginPath(), ulk_bench::kModelNull32);
+    if (!effect.ok() || ulk_bench::AnimateNumbers(effect.instance(), 5) != state.range(0)) {
+        state.SkipWithError("the benchmark module did not open");
+        return;
+    }
+    constexpr int kFrames = 250;
+    int frame = 0;
+    for (auto _ : state) {
+        effect.instance()->Evaluate((frame + 0.5) / kFrames);
+        if (++frame == kFrames) frame = 0;
+    }
+}
+BENCHMARK(BM_InstanceEvaluate)->Arg(32);
+
+using ulk_bench::Goal;
+[[maybe_unused]] const bool kRatios[] = {
+    ulk_bench::AddRatio("real number, 100,000 keys / 10 keys", "BM_EvaluateRealNumber/100000",
+                        "BM_EvaluateRealNumber/10", Goal::kAtMost, 3.0),
+    ulk_bench::AddRatio("integer number, 100,000 keys / 10 keys", "BM_EvaluateIntegerNumber/100000",
+                        "BM_EvaluateIntegerNumber/10", Goal::kAtMost, 3.0),
+    ulk_bench::AddRatio("real number scattered, 100,000 keys / 10 keys",
+                        "BM_EvaluateRealNumberScattered/100000",
+                        "BM_EvaluateRealNumberScattered/10"),
+    ulk_bench::AddTime("instance of 32 animated parameters, one Evaluate", "BM_InstanceEvaluate/32",
+                       Goal::kNone, 0.0),
+};
 
 }  // namespace
