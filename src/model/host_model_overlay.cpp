@@ -28,7 +28,14 @@ ulkHostOverlay* ulkHostModel::NewOverlay() {
     // The link goes in first: SetPlugInOverlay lets the plug-in define its
     // modes only when the overlay names this host overlay as its twin.
     pluginOverlay->mHostOverlay = hostOverlay;
-    hostOverlay->SetPlugInOverlay(pluginOverlay);
+    try {
+        hostOverlay->SetPlugInOverlay(pluginOverlay);
+    } catch (...) {
+        // The host never gets this overlay and could not delete it: both halves
+        // go as DeleteOverlay takes them, then the plug-in's exception passes on.
+        DeleteOverlay(hostOverlay);
+        throw;
+    }
     return hostOverlay;
 }
 
