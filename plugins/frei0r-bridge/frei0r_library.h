@@ -8,7 +8,10 @@
 #ifndef ULK_FREI0R_BRIDGE_FREI0R_LIBRARY_H
 #define ULK_FREI0R_BRIDGE_FREI0R_LIBRARY_H
 
+// frei0r.h declares its functions without C linkage of its own.
+extern "C" {
 #include <frei0r.h>
+}
 
 #include <memory>
 #include <string>
