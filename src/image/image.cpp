@@ -322,7 +322,11 @@ void* ulkImage::CreateBuffer() {
         if (HasAlphaPlane(format)) {
             int64_t alpha = 0;
             if (!MulSize(mPixelDelta[4] < 0 ? 0 : mPixelDelta[4], pixels, &alpha)) return nullptr;
-            planes += alpha;
+            // A sample narrower than a byte still takes one: the last one may end past
+            // pixels x pixel delta.
+            const int64_t beyond =
+                (mChannelSize[4] + 7) / 8 - (mPixelDelta[4] > 0 ? mPixelDelta[4] : 0);
+            planes += alpha + (beyond > 0 ? beyond : 0);
         }
         if (planes > size) size = planes;
 
@@ -330,6 +334,10 @@ void* ulkImage::CreateBuffer() {
             HasAlphaPlane(format) ? 4 : (mNumChannels > kMaxChannels ? kMaxChannels : mNumChannels);
         for (int i = 0; i < placed; ++i) {
             const int64_t rowDelta = mRowDeltaSet ? int64_t{mRowDelta[i]} : rowDelta0;
+            // SetData lays the rows out from the buffer's start: with a negative row delta
+            // every row after the first, and the alpha plane of formats 13 and 14, would
+            // lie before the buffer.
+            if (rowDelta < 0) return nullptr;
             const int64_t columns = packed ? mWidth / 2 : mWidth;
             if (columns <= 0) continue;
             const int64_t end = int64_t{mChannelDelta[i]} * i +

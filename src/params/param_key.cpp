@@ -17,8 +17,12 @@ void ulkParamKey::SetTime(double time) {
     mTime = time;
     // Truncation to whole 0.00000001 steps. Within +-21.47483648 this is exactly
     // the 32-bit integer conversion; beyond it the same truncation still holds
-    // instead of an out-of-range integer conversion.
-    mKeyTime = std::trunc(time * 100000000.0) / 100000000.0;
+    // instead of an out-of-range integer conversion. From 2^53 steps on (about
+    // 9e7) a double holds no fraction of a step: scaling back would only add
+    // rounding error (and beyond about 1.8e300 overflow to infinity), so that a
+    // key set at a time would not be found at it. Such times stay as they are.
+    const double steps = time * 100000000.0;
+    mKeyTime = std::fabs(steps) < 9007199254740992.0 ? std::trunc(steps) / 100000000.0 : time;
 }
 
 bool ulkParamKey::SetValue(const void* source, size_t size) {
