@@ -6,7 +6,7 @@ PREFIX     ?= $(CURDIR)/dist
 JOBS       ?= $(shell nproc)
 CMAKE_ARGS ?=
 
-.PHONY: all deps configure build test test-sanitize demo install bench clean
+.PHONY: all deps configure build test test-sanitize test-valgrind test-fuzz fuzz demo install bench clean
 
 all: build
 
@@ -22,6 +22,8 @@ build: configure
 test: build
 	@cd $(BUILD) && ctest --output-on-failure -j $(JOBS)
 	@$(MAKE) --no-print-directory test-sanitize
+	@$(MAKE) --no-print-directory test-valgrind
+	@$(MAKE) --no-print-directory test-fuzz
 
 # The whole suite again under AddressSanitizer and UndefinedBehaviorSanitizer.
 test-sanitize: deps
@@ -29,6 +31,18 @@ test-sanitize: deps
 	@cmake --build $(BUILD)-sanitize -j $(JOBS)
 	@cd $(BUILD)-sanitize && ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 \
 		ctest --output-on-failure -j $(JOBS)
+
+# The library's own test programs once under valgrind's memcheck (on the normal build).
+test-valgrind: build
+	@scripts/valgrind-tests.sh $(BUILD)
+
+# The libFuzzer targets briefly (a clang build of their own); `make fuzz` runs them long.
+FUZZ_SECONDS ?= 20
+test-fuzz: deps
+	@JOBS=$(JOBS) scripts/fuzz.sh $(FUZZ_SECONDS) $(BUILD)-fuzz
+
+fuzz: deps
+	@JOBS=$(JOBS) scripts/fuzz.sh 600 $(BUILD)-fuzz
 
 install: build
 	@cmake --install $(BUILD) >/dev/null
