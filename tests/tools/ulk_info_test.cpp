@@ -122,7 +122,14 @@ TEST(UlkInfo, ReportsFailuresAndGoesOn) {
 }
 
 TEST(UlkInfo, TextOutputFoldersAndUsage) {
-    const ToolResult text = RunInfo({ULK_TEST_PLUGIN_DIR});
+    // A folder (with a sub-folder) of two modules. Not the whole test-plugin folder: the
+    // probe modules there take their start-up argument for a control block of theirs.
+    ScratchFolder folder;
+    std::filesystem::create_directory(folder.Path("sub"));
+    std::filesystem::create_symlink(TestPluginPath("effects"), folder.Path("effects.so"));
+    std::filesystem::create_symlink(TestPluginPath("model_faults"),
+                                    folder.Path("sub/model_faults.so"));
+    const ToolResult text = RunInfo({folder.Path("")});
     EXPECT_NE(text.out.find("effects.so\n  model 0: Invert\n"), std::string::npos);
     EXPECT_NE(text.out.find("FAILED: no licence for this model"), std::string::npos);
     EXPECT_EQ(text.status, 1);  // the folder holds model_faults

@@ -55,20 +55,24 @@ std::string InstanceErrorText(const ulkHostModel& model) {
                : std::string("the plug-in made no instance");
 }
 
-int CountModels(const std::string& path, std::string* error) {
+LoadedModule::~LoadedModule() {
+    if (mDLL) ulkDLLMaker::Close(mDLL, kCloseDefault);
+}
+
+bool LoadedModule::Load(const std::string& path, std::string* error) {
     dlerror();
-    unsigned char startUp = 0;
-    ulkDLL* dll = ulkDLLMaker::Open(path.c_str(), &startUp, nullptr);
-    if (!dll) {
-        const char* reason = dlerror();
-        *error = path + ": " +
-                 (reason ? std::string("cannot load the module: ") + reason
-                         : std::string("cannot load or start the module"));
-        return -1;
-    }
-    const int count = dll->GetNumModels();
-    ulkDLLMaker::Close(dll, kCloseDefault);
-    return count;
+    mDLL = ulkDLLMaker::Open(path.c_str(), &mStartUpFlag, nullptr);
+    if (mDLL) return true;
+    const char* reason = dlerror();
+    *error = path + ": " +
+             (reason ? std::string("cannot load the module: ") + reason
+                     : std::string("cannot load or start the module"));
+    return false;
+}
+
+int CountModels(const std::string& path, std::string* error) {
+    LoadedModule module;
+    return module.Load(path, error) ? module.NumModels() : -1;
 }
 
 void SplitEffectSpec(const std::string& spec, std::string* path, std::string* selector) {

@@ -198,12 +198,12 @@ ModuleInfo DescribeModule(const std::string& path) {
     ModuleInfo module;
     module.path = path;
     std::string error;
-    const int count = CountModels(path, &error);
-    if (count < 0) {
+    LoadedModule loaded;
+    if (!loaded.Load(path, &error)) {
         module.error = error.substr(path.size() + 2);  // without the "PATH: " prefix
         return module;
     }
-    for (int i = 0; i < count; ++i) {
+    for (int i = 0; i < loaded.NumModels(); ++i) {
         ModelInfo model;
         model.index = i;
         DescribeModel(path, &model);

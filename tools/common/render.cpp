@@ -482,7 +482,10 @@ bool Render(const RenderSettings& settings, const std::function<void(const std::
                             : openEnded              ? 1
                                                      : range.last + 1;
 
-    // Every model and instance is made here, before any worker runs.
+    // Every model and instance is made here, before any worker runs; they share one start-up
+    // of the module.
+    LoadedModule module;
+    if (!module.Load(settings.plugin, error)) return false;
     const int modelIndex = FindModel(settings.plugin, settings.model, error);
     if (modelIndex < 0) return false;
     const long long known = openEnded ? 0 : range.Count();

@@ -27,6 +27,25 @@ std::string ModelErrorText(const ulkHostModel& model);
 /// Why NewInstance answered null: the error record's text, or that the plug-in made none.
 std::string InstanceErrorText(const ulkHostModel& model);
 
+/// Keeps a module loaded and started while it lives, so that the models opened meanwhile
+/// share one start-up (with the start-up flag 0).
+class LoadedModule {
+  public:
+    LoadedModule() = default;
+    ~LoadedModule();
+    LoadedModule(const LoadedModule&) = delete;
+    LoadedModule& operator=(const LoadedModule&) = delete;
+
+    /// Loads and starts path. False with "PATH: reason" when it cannot be.
+    bool Load(const std::string& path, std::string* error);
+    /// How many models the module offers.
+    int NumModels() const { return mDLL ? mDLL->GetNumModels() : 0; }
+
+  private:
+    ulkDLL* mDLL = nullptr;
+    unsigned char mStartUpFlag = 0;  // the module may keep the pointer while it is loaded
+};
+
 /// The number of models path offers, or -1 with a message when the module cannot be loaded
 /// or started.
 int CountModels(const std::string& path, std::string* error);
