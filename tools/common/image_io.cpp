@@ -105,8 +105,8 @@ bool WriteImageUnguarded(const std::string& path, const Frame& frame, std::strin
     const bool keepAlpha = output->supports("alpha");
     const int channels = keepAlpha ? 4 : 3;
     OIIO::ImageSpec layout(frame.Width(), frame.Height(), channels, OIIO::TypeDesc::UINT8);
-    header.attribute("oiio:UnassociatedAlpha", 1);
-    if (!keepAlpha) header.alpha_channel = -1;
+    layout.attribute("oiio:UnassociatedAlpha", 1);
+    if (!keepAlpha) layout.alpha_channel = -1;
 
     std::vector<uint8_t> rgb;
     const void* pixels = frame.Data();
