@@ -1,4 +1,4 @@
-// ulkModel_v1: the plug-in model base as a module uses it and before it is attached.
+// ulkModel_v1: the plug-in model base before and after it is attached to a host model.
 #include "model_host.h"
 
 namespace {
@@ -20,17 +20,13 @@ class Detached : public ulkModel_v1 {
 
 using ModelTest = ModelHostTest;
 
-TEST_F(ModelTest, DetachedModelRefusesCallbacksAndIgnoresNullInstances) {
-    Detached model;
-    EXPECT_EQ(model.mHostModel, nullptr);
-    EXPECT_FALSE(model.SetUpdateParamsCallback(&UpdateParams));
-    EXPECT_FALSE(model.SetFlushInstanceDataCallback(&Flush));
-    model.DeleteInstance(nullptr);
-    EXPECT_EQ(model.GetInitString(), nullptr);
-    EXPECT_FALSE(model.HasUI());
-}
+TEST_F(ModelTest, CallbacksNeedAHostModelAndReachIt) {
+    Detached detached;
+    EXPECT_EQ(detached.mHostModel, nullptr);
+    EXPECT_FALSE(detached.SetUpdateParamsCallback(&UpdateParams));
+    EXPECT_FALSE(detached.SetFlushInstanceDataCallback(&Flush));
+    detached.DeleteInstance(nullptr);
 
-TEST_F(ModelTest, AttachedModelForwardsToItsHostModel) {
     ulkHostModel host(0);
     ASSERT_TRUE(host.Open(TestPluginPath("effects").c_str(), 0, nullptr));
     ulkModel_v1* model = host.GetModel();
@@ -38,17 +34,13 @@ TEST_F(ModelTest, AttachedModelForwardsToItsHostModel) {
     EXPECT_TRUE(model->SetFlushInstanceDataCallback(&Flush));
     EXPECT_EQ(host.GetUpdateParamsCallback(), &UpdateParams);
     EXPECT_EQ(host.GetFlushInstanceDataCallback(), &Flush);
-
     model->SetPluginWarning("careful");
     EXPECT_EQ(host.GetError(), kErrorPluginWarning);
     EXPECT_STREQ(model->GetErrorString(), "careful");
-    model->SetError(kErrorNotSupported);
-    EXPECT_EQ(model->GetError(), kErrorNotSupported);
 
     // A copy refers to the same host model.
-    Detached copy;
-    static_cast<ulkModel_v1&>(copy) = *model;
-    EXPECT_EQ(copy.mHostModel, &host);
+    static_cast<ulkModel_v1&>(detached) = *model;
+    EXPECT_EQ(detached.mHostModel, &host);
 }
 
 }  // namespace
