@@ -568,8 +568,10 @@ void ModelRun::CheckOverlay() {
         overlay->GetModeName(i, name, sizeof name);
         names.push_back(name);
         if (name[0] == '\0') problems.push_back("mode " + std::to_string(i) + " has no name");
-        overlay->SetMode(i);
-        if (overlay->GetMode() != i)
+        std::string error;
+        if (!NoThrow([&] { overlay->SetMode(i); }, &error))
+            problems.push_back("selecting mode " + std::to_string(i) + " " + error);
+        else if (overlay->GetMode() != i)
             problems.push_back("mode " + std::to_string(i) + " cannot be selected");
     }
     Report(problems.empty(), "overlay modes",
@@ -579,13 +581,19 @@ void ModelRun::CheckOverlay() {
 
     GuardedSurface surface;
     {
-        overlay->SetInstance(mInstance);
-        surface.SetOverlay(overlay);
+        std::string error;
+        NoThrow(
+            [&] {
+                overlay->SetInstance(mInstance);
+                surface.SetOverlay(overlay);
+            },
+            &error);
         const bool bound = overlay->GetContext() == &surface && surface.GetOverlay() == overlay &&
                            overlay->GetInstance() == mInstance->GetPluginInstance();
-        Report(bound, "overlay binding",
-               bound ? "bound to a 64x48 surface and the instance"
-                     : "the overlay and the surface do not name each other");
+        Report(bound && error.empty(), "overlay binding",
+               !error.empty() ? "binding " + error
+               : bound        ? "bound to a 64x48 surface and the instance"
+                              : "the overlay and the surface do not name each other");
     }
 
     // A few events in every mode, as a user would give them.

@@ -10,6 +10,7 @@
 #include <chrono>
 #include <cstdio>
 #include <cstring>
+#include <exception>
 #include <thread>
 
 namespace ulk_tools {
@@ -48,7 +49,16 @@ bool WaitUntil(pid_t pid, Clock::time_point deadline, int* status) {
     // A crash must end the child with its signal, not in a handler inherited from the parent.
     for (int sig : {SIGSEGV, SIGBUS, SIGFPE, SIGILL, SIGABRT}) signal(sig, SIG_DFL);
     signal(SIGPIPE, SIG_IGN);
-    body(fd);
+    // Nothing may unwind out of here: the child would go on running the parent's code.
+    try {
+        body(fd);
+    } catch (const std::exception& e) {
+        std::fprintf(stderr, "ulk-validate: an exception escaped a check: %s\n", e.what());
+        _exit(70);
+    } catch (...) {
+        std::fprintf(stderr, "ulk-validate: an exception escaped a check\n");
+        _exit(70);
+    }
     std::fflush(stderr);
     close(fd);
     _exit(0);

@@ -27,7 +27,7 @@ struct ChildResult {
 };
 
 /// Forks; the child runs body(fd) with fd the pipe's writing end and then ends with _exit(0)
-/// (no exit handlers run in it). The parent waits at most timeoutSeconds, then kills it.
+/// (no exit handlers run in it), or _exit(70) when an exception leaves body. The parent waits at most timeoutSeconds, then kills it.
 ChildResult RunInChild(int timeoutSeconds, const std::function<void(int fd)>& body);
 
 /// Writes text and a newline to fd whole, retrying short writes; false when the pipe broke.
