@@ -12,22 +12,18 @@
 
 namespace {
 
-std::set<void*> gLive;
-int gAllocCalls = 0;
+std::set<void*> gLive;  // blocks the host handed out and has not got back
 std::string gConsole;
 
 void* CountingAlloc(size_t size) {
-    ++gAllocCalls;
     void* p = std::malloc(size);
     gLive.insert(p);
     return p;
 }
-
 void CountingFree(void* p) {
     gLive.erase(p);
     std::free(p);
 }
-
 int FormattingConsole(const char* format, ...) {
     char buffer[256];
     va_list args;
@@ -39,39 +35,35 @@ int FormattingConsole(const char* format, ...) {
 }
 
 class HostGlobalTest : public ::testing::Test {
-protected:
-    void SetUp() override { Install(); }
+  protected:
+    void SetUp() override {
+        ulkHostGlobal::SetAllocCallback(&CountingAlloc);
+        ulkHostGlobal::SetFreeCallback(&CountingFree);
+    }
     void TearDown() override {
-        Install();
+        SetUp();
         ulkHostGlobal::FreeULKGlobalMemory();
         EXPECT_TRUE(gLive.empty()) << "host texts leaked";
         ulkHostGlobal::SetAllocCallback(nullptr);
         ulkHostGlobal::SetFreeCallback(nullptr);
         ulkHostGlobal::SetConsoleCallback(nullptr);
     }
-    static void Install() {
-        ulkHostGlobal::SetAllocCallback(&CountingAlloc);
-        ulkHostGlobal::SetFreeCallback(&CountingFree);
-    }
 };
 
-TEST_F(HostGlobalTest, MemoryGoesThroughTheHost) {
-    gAllocCalls = 0;
+}  // namespace
+
+TEST_F(HostGlobalTest, MemoryAndConsoleGoThroughTheHost) {
     EXPECT_EQ(ulkGlobal::AllocMem(0), nullptr);
-    EXPECT_EQ(gAllocCalls, 0);
     void* p = ulkGlobal::AllocMem(16);
     EXPECT_EQ(gLive.count(p), 1u);
     ulkGlobal::FreeMem(p);
     EXPECT_TRUE(gLive.empty());
-    ulkGlobal::FreeMem(nullptr);
-
     ulkHostGlobal::SetAllocCallback(nullptr);
     ulkHostGlobal::SetFreeCallback(nullptr);
     EXPECT_EQ(ulkHostGlobal::AllocMem(8), nullptr);
-    ulkHostGlobal::FreeMem(&gAllocCalls);  // no release function: nothing happens
-}
+    ulkHostGlobal::FreeMem(&gConsole);  // no release function: nothing happens
 
-TEST_F(HostGlobalTest, ConsoleTextIsNeverAFormat) {
+    // The text is never a format.
     EXPECT_EQ(ulkGlobal::ConsolePrintf("ignored"), 0);
     ulkHostGlobal::SetConsoleCallback(&FormattingConsole);
     gConsole.clear();
@@ -79,11 +71,10 @@ TEST_F(HostGlobalTest, ConsoleTextIsNeverAFormat) {
     EXPECT_EQ(gConsole, "100% done %s %n\n");
 }
 
-TEST_F(HostGlobalTest, HostDescriptionIsCopiedAndBounded) {
+TEST_F(HostGlobalTest, HostDescriptionIsCopiedBoundedAndReleased) {
     char info[32] = "-", vendor[4] = "-", app[32] = "-", version[32] = "-";
     ulkHostGlobal::GetHostDescription(info, 32, vendor, 4, app, 32, version, 32);
     EXPECT_STREQ(info, "-");  // nothing stored yet
-
     ulkHostGlobal::SetHostDescription("Editor host", "VendorName", "Cutter", "2.1");
     ulkGlobal::GetHostDescription(info, 32, vendor, 4, app, 32, version, 32);
     EXPECT_STREQ(info, "Editor host");
@@ -99,14 +90,9 @@ TEST_F(HostGlobalTest, HostDescriptionIsCopiedAndBounded) {
     EXPECT_STREQ(app, "Cutter");
 
     ulkHostGlobal::FreeULKGlobalMemory();
+    EXPECT_TRUE(gLive.empty());
     std::strcpy(app, "-");
     ulkHostGlobal::GetHostDescription(nullptr, 0, nullptr, 0, app, 32, nullptr, 0);
-    EXPECT_STREQ(app, "-");
-
-    // Without an allocator nothing is stored.
-    ulkHostGlobal::SetAllocCallback(nullptr);
-    ulkHostGlobal::SetHostDescription("a", "b", "c", "d");
-    ulkHostGlobal::GetHostDescription(info, 32, nullptr, 0, app, 32, nullptr, 0);
     EXPECT_STREQ(app, "-");
 }
 
@@ -116,17 +102,12 @@ TEST_F(HostGlobalTest, VersionTextsAreAlwaysTerminated) {
     ulkVersion version{};
     ulkHostGlobal::GetLibraryVersion(line, sizeof line, &version);
     EXPECT_STREQ(line, "ULK Library Version 1.05\n");
-    EXPECT_EQ(std::strlen(line), 25u);
     EXPECT_EQ(line[63], '\0');  // padded
-    EXPECT_EQ(version.major, 1);
     EXPECT_EQ(version.minor, 5);
-    EXPECT_EQ(version.beta, 0);
-
-    char small[8];
-    ulkHostGlobal::GetLibraryVersion(small, sizeof small, &version);
+    char small[8], untouched = 'u';
+    ulkHostGlobal::GetLibraryVersion(small, sizeof small, nullptr);
+    ulkHostGlobal::GetLibraryVersion(&untouched, 0, nullptr);
     EXPECT_STREQ(small, "ULK Lib");
-    char untouched = 'u';
-    ulkHostGlobal::GetLibraryVersion(&untouched, 0, &version);
     EXPECT_EQ(untouched, 'u');
 
     char host[16] = "-";
@@ -142,5 +123,3 @@ TEST_F(HostGlobalTest, VersionTextsAreAlwaysTerminated) {
     ulkHostGlobal::GetHostLibraryVersion(host, 3, nullptr);
     EXPECT_STREQ(host, "Ho");
 }
-
-}  // namespace
