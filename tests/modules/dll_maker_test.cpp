@@ -11,24 +11,16 @@
 namespace {
 
 class RegistryTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override { ResetRegistry(); }
     void TearDown() override { ResetRegistry(); }
 
-    ulkDLL* Open(const char* name, ModuleProbe* probe = nullptr) {
+    static ulkDLL* Open(const char* name, ModuleProbe* probe = nullptr) {
         return ulkDLLMaker::Open(TestPluginPath(name).c_str(),
                                  reinterpret_cast<unsigned char*>(probe), nullptr);
     }
+    static bool Loaded(const char* name) { return IsLoaded(TestPluginPath(name)); }
 };
-
-TEST_F(RegistryTest, StartBoundAllowsOneModuleInUse) {
-    ulkDLL* a = Open("probe_a");
-    ASSERT_NE(a, nullptr);
-    EXPECT_EQ(Open("probe_b"), nullptr);  // bound 1, A in use
-    ulkDLLMaker::Close(a, kCloseNow);
-    EXPECT_FALSE(IsLoaded(TestPluginPath("probe_a")));
-    EXPECT_NE(Open("probe_b"), nullptr);
-}
 
 TEST_F(RegistryTest, SharedModulesAreCountedAndUnloadedByTheLastClose) {
     ModuleProbe probe;
@@ -36,14 +28,14 @@ TEST_F(RegistryTest, SharedModulesAreCountedAndUnloadedByTheLastClose) {
     ASSERT_NE(a, nullptr);
     EXPECT_EQ(Open("probe_a"), a);
     EXPECT_EQ(a->GetRefCount(), 2);
-    EXPECT_EQ(probe.startUps, 1);  // started once
+    EXPECT_EQ(probe.startUps, 1);
+    EXPECT_EQ(Open("probe_b"), nullptr);  // start bound 1, A in use
 
     ulkDLLMaker::Close(a, kCloseNow);
-    EXPECT_EQ(a->GetRefCount(), 1);
-    EXPECT_TRUE(IsLoaded(TestPluginPath("probe_a")));
+    EXPECT_TRUE(Loaded("probe_a"));
     ulkDLLMaker::Close(a, kCloseNow);
     EXPECT_EQ(probe.shutDowns, 1);
-    EXPECT_FALSE(IsLoaded(TestPluginPath("probe_a")));
+    EXPECT_FALSE(Loaded("probe_a"));
     EXPECT_EQ(ulkDLLMaker::GetNumLoaded(), 0);
 }
 
@@ -54,11 +46,7 @@ TEST_F(RegistryTest, KeptModulesAreReusedAndEvictedOldestFirst) {
     ASSERT_NE(a, nullptr);
     ulkDLLMaker::Close(a, kCloseDefault);
     EXPECT_EQ(a->GetRefCount(), 0);
-    EXPECT_TRUE(IsLoaded(TestPluginPath("probe_a")));
-
-    // Reuse: same object, not started again.
-    EXPECT_EQ(Open("probe_a"), a);
-    EXPECT_EQ(a->GetRefCount(), 1);
+    EXPECT_EQ(Open("probe_a"), a);  // reused, not started again
     EXPECT_EQ(probeA.startUps, 1);
     ulkDLLMaker::Close(a, kCloseKeep);
 
@@ -66,14 +54,12 @@ TEST_F(RegistryTest, KeptModulesAreReusedAndEvictedOldestFirst) {
     ulkDLL* b = Open("probe_b", &probeB);
     ASSERT_NE(b, nullptr);
     EXPECT_EQ(probeA.shutDowns, 1);
-    EXPECT_FALSE(IsLoaded(TestPluginPath("probe_a")));
-    EXPECT_EQ(ulkDLLMaker::GetNumLoaded(), 1);
-
-    // An idle module closed with kCloseNow is unloaded; any mode but 0 and 2 keeps.
+    EXPECT_FALSE(Loaded("probe_a"));
+    // Any mode but 0 and 2 keeps; kCloseNow unloads an idle module.
     ulkDLLMaker::Close(b, static_cast<ulkCloseMode_t>(7));
-    EXPECT_TRUE(IsLoaded(TestPluginPath("probe_b")));
+    EXPECT_TRUE(Loaded("probe_b"));
     ulkDLLMaker::Close(b, kCloseNow);
-    EXPECT_FALSE(IsLoaded(TestPluginPath("probe_b")));
+    EXPECT_FALSE(Loaded("probe_b"));
 }
 
 TEST_F(RegistryTest, BoundIsRaisedAndLowered) {
@@ -88,15 +74,15 @@ TEST_F(RegistryTest, BoundIsRaisedAndLowered) {
     ulkDLLMaker::Close(c, kCloseKeep);
     ulkDLLMaker::Close(a, kCloseKeep);
     ASSERT_NE(Open("probe_d"), nullptr);
-    EXPECT_FALSE(IsLoaded(TestPluginPath("probe_a")));
-    EXPECT_TRUE(IsLoaded(TestPluginPath("probe_c")));
+    EXPECT_FALSE(Loaded("probe_a"));
+    EXPECT_TRUE(Loaded("probe_c"));
 
-    // With a bound of 0 only an idle module makes room.
+    // With a bound of 0 only an idle module makes room; a nonsense bound breaks nothing.
     ulkDLLMaker::SetActiveDLLs(0);
     EXPECT_NE(Open("probe_a"), nullptr);  // evicts idle C
-    EXPECT_FALSE(IsLoaded(TestPluginPath("probe_c")));
-    EXPECT_EQ(Open("probe_c"), nullptr);  // nothing idle left
-    ulkDLLMaker::SetActiveDLLs(-3);       // a nonsense bound must not break the list
+    EXPECT_FALSE(Loaded("probe_c"));
+    EXPECT_EQ(Open("probe_c"), nullptr);
+    ulkDLLMaker::SetActiveDLLs(-3);
     EXPECT_EQ(Open("probe_c"), nullptr);
     EXPECT_EQ(ulkDLLMaker::GetNumLoaded(), 3);
 }

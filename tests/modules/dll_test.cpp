@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <fstream>
 #include <string>
+#include <vector>
 
 #include "../plugins/module_probe/module_probe.h"
 #include "registry_guard.h"
@@ -13,7 +14,7 @@
 namespace {
 
 class ModuleTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override { ResetRegistry(); }
     void TearDown() override {
         ResetRegistry();
@@ -21,66 +22,62 @@ protected:
         ulkSetPlayMode(kPlayModePlay);
         ULKSetOpticalFlowMode(1);
     }
-    unsigned char* Arg(ModuleProbe& probe) { return reinterpret_cast<unsigned char*>(&probe); }
+    static ulkDLL* Open(const std::string& path, ModuleProbe* probe, hostAppInfo* info = nullptr) {
+        return ulkDLLMaker::Open(path.c_str(), reinterpret_cast<unsigned char*>(probe), info);
+    }
 };
 
 unsigned char HostAttribute(ulkHostAttribute, void*) {
     return 1;
 }
 
-TEST_F(ModuleTest, ModuleWithoutEntryPointsStartsWithOneModel) {
-    ulkDLL* dll = ulkDLLMaker::Open(TestPluginPath("no_entry_points").c_str(), nullptr, nullptr);
-    ASSERT_NE(dll, nullptr);
-    EXPECT_TRUE(dll->IsOpen());
-    EXPECT_EQ(dll->GetNumModels(), 1);
-    EXPECT_EQ(dll->GetRefCount(), 1);
-    EXPECT_EQ(dll->GetSymbol("ulkNewModel_v1"), nullptr);
-    EXPECT_NE(dll->GetSymbol("notAnEntryPoint"), nullptr);
-    EXPECT_STREQ(dll->GetErrorString(), "Not yet");
-}
-
 TEST_F(ModuleTest, StartUpSendsAttributesInOrderAndCountsModels) {
+    for (bool host : {true, false}) {
+        SCOPED_TRACE(host ? "with host callback and info" : "without");
+        ResetRegistry();
+        ModuleProbe probe;
+        probe.numModels = 3;
+        InstallHostAttributeCallback(host ? &HostAttribute : nullptr);
+        auto* info = reinterpret_cast<hostAppInfo*>(&probe);  // any pointer: passed on unread
+        ulkDLL* dll = Open(TestPluginPath("probe_a"), &probe, host ? info : nullptr);
+        ASSERT_NE(dll, nullptr);
+        EXPECT_EQ(probe.startUps, 1);
+        EXPECT_EQ(dll->GetNumModels(), 3);
+        // 15 only with a host callback, 1 only with host info.
+        const std::vector<int> expected =
+            host ? std::vector<int>{0, 3, 14, 15, 1} : std::vector<int>{0, 3, 14};
+        EXPECT_EQ(std::vector<int>(probe.attributes, probe.attributes + probe.attributeCount),
+                  expected);
+        EXPECT_EQ(probe.hostInfo, host ? static_cast<void*>(&probe) : nullptr);
+        EXPECT_EQ(probe.hostCallback, host ? reinterpret_cast<void*>(&HostAttribute) : nullptr);
+    }
+    // The mode functions read the value of the moment; host values pass through unchanged.
     ModuleProbe probe;
-    probe.numModels = 3;
-    InstallHostAttributeCallback(&HostAttribute);
-    auto* info = reinterpret_cast<hostAppInfo*>(&probe);  // any pointer: passed on unread
-    ulkDLL* dll = ulkDLLMaker::Open(TestPluginPath("probe_a").c_str(), Arg(probe), info);
-    ASSERT_NE(dll, nullptr);
-
-    EXPECT_EQ(probe.startUps, 1);
-    EXPECT_EQ(dll->GetNumModels(), 3);
-    EXPECT_EQ(dll->GetNumModels(12.5f), 3);
-    ASSERT_EQ(probe.attributeCount, 5);
-    const int expected[] = {0, 3, 14, 15, 1};
-    for (int i = 0; i < 5; ++i) EXPECT_EQ(probe.attributes[i], expected[i]) << "attribute #" << i;
-    EXPECT_EQ(probe.hostInfo, static_cast<void*>(&probe));
-    EXPECT_EQ(probe.hostCallback, reinterpret_cast<void*>(&HostAttribute));
-}
-
-TEST_F(ModuleTest, ModeFunctionsReadTheValueOfTheMoment) {
-    ModuleProbe probe;
-    ASSERT_NE(ulkDLLMaker::Open(TestPluginPath("probe_a").c_str(), Arg(probe), nullptr), nullptr);
-    ASSERT_NE(probe.renderFlag, nullptr);
-    ASSERT_NE(probe.opticalFlow, nullptr);
-    ASSERT_NE(probe.playMode, nullptr);
-    // Without a host attribute callback, attribute 15 is not sent; no host info, no 1.
-    EXPECT_EQ(probe.attributeCount, 3);
-
+    ResetRegistry();
+    ASSERT_NE(Open(TestPluginPath("probe_b"), &probe), nullptr);
+    ASSERT_TRUE(probe.renderFlag && probe.opticalFlow && probe.playMode);
     ulkSetPlayMode(kPlayModeRender);
     ULKSetOpticalFlowMode(7);
     EXPECT_EQ(probe.playMode(), 0);
     EXPECT_EQ(probe.opticalFlow(), 7);
-    ulkSetPlayMode(static_cast<ulkPlayMode>(42));  // host values pass through unchanged
+    ulkSetPlayMode(static_cast<ulkPlayMode>(42));
     EXPECT_EQ(probe.playMode(), 42);
     EXPECT_EQ(probe.renderFlag(), 1);  // no instance has rendered: its start value
+}
+
+TEST_F(ModuleTest, ModuleWithoutEntryPointsStartsWithOneModel) {
+    ulkDLL* dll = Open(TestPluginPath("no_entry_points"), nullptr);
+    ASSERT_NE(dll, nullptr);
+    EXPECT_EQ(dll->GetNumModels(), 1);
+    EXPECT_EQ(dll->GetSymbol("ulkNewModel_v1"), nullptr);
+    EXPECT_NE(dll->GetSymbol("notAnEntryPoint"), nullptr);
 }
 
 TEST_F(ModuleTest, FailedStartUpIsShutDownAndUnloaded) {
     ModuleProbe probe;
     probe.startUpResult = false;
     const std::string path = TestPluginPath("probe_a");
-    EXPECT_EQ(ulkDLLMaker::Open(path.c_str(), Arg(probe), nullptr), nullptr);
-    EXPECT_EQ(probe.startUps, 1);
+    EXPECT_EQ(Open(path, &probe), nullptr);
     EXPECT_EQ(probe.shutDowns, 1);
     EXPECT_EQ(probe.attributeCount, 3);  // 0, 3 and 14 arrive whatever start-up answered
     EXPECT_EQ(probe.numModelsCalls, 0);
@@ -90,43 +87,36 @@ TEST_F(ModuleTest, FailedStartUpIsShutDownAndUnloaded) {
 
 TEST_F(ModuleTest, BadFilesAreRefusedWithoutHarm) {
     const std::string dir = ::testing::TempDir();
-    const std::string text = dir + "/ulk_not_a_module.so";
-    const std::string empty = dir + "/ulk_empty.so";
+    const std::string text = dir + "/ulk_not_a_module.so", empty = dir + "/ulk_empty.so";
     std::ofstream(text) << "this is not a shared object\n";
     std::ofstream{empty};
-
-    for (const std::string& path : {std::string("/no/such/file.so"), text, empty, dir}) {
-        EXPECT_EQ(ulkDLLMaker::Open(path.c_str(), nullptr, nullptr), nullptr) << path;
-    }
+    for (const std::string& path : {std::string("/no/such/file.so"), text, empty, dir})
+        EXPECT_EQ(Open(path, nullptr), nullptr) << path;
     EXPECT_EQ(ulkDLLMaker::Open(nullptr, nullptr, nullptr), nullptr);
     EXPECT_EQ(ulkDLLMaker::GetNumLoaded(), 0);
-    // The registry is left usable.
-    EXPECT_NE(ulkDLLMaker::Open(TestPluginPath("probe_a").c_str(), nullptr, nullptr), nullptr);
+    EXPECT_NE(Open(TestPluginPath("probe_a"), nullptr), nullptr) << "the registry is usable";
     std::remove(text.c_str());
     std::remove(empty.c_str());
 }
 
 TEST_F(ModuleTest, PlatformModuleKeepsLongPathsAndClosesOnce) {
-    std::string longPath(300, 'x');
-    longPath.insert(0, "/");
-    ulkNTDLL dll(longPath.c_str());
-    EXPECT_STREQ(dll.GetName(), longPath.c_str());
-    EXPECT_FALSE(dll.Open());
-    EXPECT_FALSE(dll.StartUp(nullptr));  // not loaded: nothing is called
-
-    const std::string path = TestPluginPath("probe_b");
-    {
-        ulkNTDLL loaded(path.c_str());
-        ASSERT_TRUE(loaded.Open());
-        EXPECT_TRUE(IsLoaded(path));
-        loaded.Close();
-        EXPECT_FALSE(loaded.IsOpen());
-        EXPECT_FALSE(IsLoaded(path));
-        loaded.Close();
-        EXPECT_EQ(loaded.GetSymbol("ulkStartUp_v1"), nullptr);
-    }
+    const std::string longPath = "/" + std::string(300, 'x');
+    ulkNTDLL missing(longPath.c_str());
+    EXPECT_STREQ(missing.GetName(), longPath.c_str());
+    EXPECT_FALSE(missing.Open());
+    EXPECT_FALSE(missing.StartUp(nullptr));  // not loaded: nothing is called
     ulkNTDLL unnamed(nullptr);
     EXPECT_FALSE(unnamed.Open());
+
+    const std::string path = TestPluginPath("probe_b");
+    ulkNTDLL loaded(path.c_str());
+    ASSERT_TRUE(loaded.Open());
+    EXPECT_TRUE(IsLoaded(path));
+    loaded.Close();
+    loaded.Close();
+    EXPECT_FALSE(loaded.IsOpen());
+    EXPECT_FALSE(IsLoaded(path));
+    EXPECT_EQ(loaded.GetSymbol("ulkStartUp_v1"), nullptr);
 }
 
 }  // namespace
