@@ -1,44 +1,28 @@
 // Booleans and group enables: one byte, stepping from key to key.
-#include <gtest/gtest.h>
+#include "param_test_helpers.h"
 
-#include "ulk/ulk.h"
-
-TEST(Boolean, ValuesAndEvaluation) {
-    ulkPBoolean* b = ulkPBoolean::New("B", "b", nullptr, 0);
-    ASSERT_NE(b, nullptr);
-    EXPECT_FALSE(b->GetValue(0.0));
-    EXPECT_FALSE(b->GetValue(0.9));
-    EXPECT_FALSE(b->GetDefaultValue());
-    b->SetValue(0.5, true);
-    EXPECT_FALSE(b->GetValue(0.25));
-    EXPECT_TRUE(b->GetValue(0.75));
-
+TEST(Boolean, StepsFromKeyToKeyIntoItsOwnByteOnly) {
     bool flag = true;
-    ulkPBoolean* s = ulkPBoolean::New("S", "s", &flag, sizeof flag);
-    EXPECT_TRUE(s->GetDefaultValue());
-    s->SetValue(0.5, false);
-    EXPECT_TRUE(s->Evaluate(0.25, nullptr, 0, -1));
+    Owned<ulkPBoolean> none(ulkPBoolean::New("B", "b", nullptr, 0));
+    Owned<ulkPBoolean> b(ulkPBoolean::New("S", "s", &flag, sizeof flag));
+    Owned<ulkPGroupEnable> e(ulkPGroupEnable::New("On", "on", &flag, 1));
+    ASSERT_TRUE(none && b && e);
+    EXPECT_FALSE(none->GetValue(0.9));
+    EXPECT_FALSE(none->GetDefaultValue());
+    EXPECT_TRUE(b->GetDefaultValue());
+    b->SetValue(0.5, false);
+    EXPECT_TRUE(b->Evaluate(0.25, nullptr, 0, -1));
     EXPECT_TRUE(flag);
-    EXPECT_TRUE(s->Evaluate(0.75, nullptr, 0, -1));
+    EXPECT_TRUE(b->Evaluate(0.75, nullptr, 0, -1));
     EXPECT_FALSE(flag);
     bool other = true;
-    EXPECT_FALSE(s->Evaluate(0.75, &other, 1, -1));
+    EXPECT_FALSE(b->Evaluate(0.75, &other, 1, -1));
     EXPECT_TRUE(other);
-    EXPECT_STREQ(s->ClassName(), "Boolean");
-    ulkParameter::Delete(b);
-    ulkParameter::Delete(s);
-}
 
-TEST(Boolean, GroupEnableIsABooleanWithItsOwnIdentity) {
-    bool on = true;
-    ulkPGroupEnable* e = ulkPGroupEnable::New("On", "on", &on, 1);
-    ASSERT_NE(e, nullptr);
+    // A group enable is a boolean with an identity of its own.
+    EXPECT_TRUE(e->IsBoolean() && e->IsGroupEnable() && !e->IsGroup());
     EXPECT_STREQ(e->ClassName(), "GroupEnable");
-    EXPECT_TRUE(e->IsBoolean());
-    EXPECT_TRUE(e->IsGroupEnable());
-    EXPECT_FALSE(e->IsGroup());
-    e->SetValue(0.5, false);
+    e->SetValue(0.5, true);
     EXPECT_TRUE(e->Evaluate(0.6, nullptr, 0, -1));
-    EXPECT_FALSE(on);
-    ulkParameter::Delete(e);
+    EXPECT_TRUE(flag);
 }
