@@ -82,6 +82,10 @@ class ULK_API ulkHostModel {
     void DeleteOverlay(ulkHostOverlay* hostOverlay);
 
     // --- identity (set by the plug-in; texts are kept by pointer, not copied)
+    // The texts live in the plug-in module: read them while the model is open.
+    // After Close the getters still answer the last pointers, but once the
+    // registry has unloaded the module (kCloseNow) they point nowhere; copy
+    // what you need to keep before closing.
     void SetType(ulkPluginType type) { mType = type; }
     void SetName(const char* name) { mName = name; }
     void SetClass(ulkPluginClass pluginClass) { mClass = pluginClass; }
