@@ -34,7 +34,6 @@ unsigned char HostAttribute(ulkHostAttribute, void*) {
 TEST_F(ModuleTest, StartUpSendsAttributesInOrderAndCountsModels) {
     for (bool host : {true, false}) {
         SCOPED_TRACE(host ? "with host callback and info" : "without");
-        ResetRegistry();
         ModuleProbe probe;
         probe.numModels = 3;
         InstallHostAttributeCallback(host ? &HostAttribute : nullptr);
@@ -50,10 +49,10 @@ TEST_F(ModuleTest, StartUpSendsAttributesInOrderAndCountsModels) {
                   expected);
         EXPECT_EQ(probe.hostInfo, host ? static_cast<void*>(&probe) : nullptr);
         EXPECT_EQ(probe.hostCallback, host ? reinterpret_cast<void*>(&HostAttribute) : nullptr);
+        ResetRegistry();  // shuts the module down while its probe lives
     }
     // The mode functions read the value of the moment; host values pass through unchanged.
     ModuleProbe probe;
-    ResetRegistry();
     ASSERT_NE(Open(TestPluginPath("probe_b"), &probe), nullptr);
     ASSERT_TRUE(probe.renderFlag && probe.opticalFlow && probe.playMode);
     ulkSetPlayMode(kPlayModeRender);
@@ -63,6 +62,7 @@ TEST_F(ModuleTest, StartUpSendsAttributesInOrderAndCountsModels) {
     ulkSetPlayMode(static_cast<ulkPlayMode>(42));
     EXPECT_EQ(probe.playMode(), 42);
     EXPECT_EQ(probe.renderFlag(), 1);  // no instance has rendered: its start value
+    ResetRegistry();
 }
 
 TEST_F(ModuleTest, ModuleWithoutEntryPointsStartsWithOneModel) {
