@@ -34,17 +34,22 @@ bool SamplesBuilt() {
 
 TEST(UlkInfo, DescribesTheSamplePluginsAsJson) {
     if (!SamplesBuilt()) GTEST_SKIP() << "sample plug-ins not built";
-    const ToolResult result = RunInfo({"--json", ULK_PLUGIN_DIR});
+    // The samples by name: the folder also holds the frei0r bridge, whose
+    // installed effects are not ours to describe here.
+    std::vector<std::string> args = {"--json"};
+    for (const char* sample : {"levels", "blur", "wipe", "generator", "crop"})
+        args.push_back(SamplePluginPath(sample));
+    const ToolResult result = RunInfo(args);
     ASSERT_EQ(result.status, 0) << result.err;
     const json doc = json::parse(result.out);
     std::map<std::string, json> byName;
+    ASSERT_EQ(doc["modules"].size(), 5u);
     for (const json& module : doc["modules"]) {
-        EXPECT_TRUE(module["ok"].get<bool>()) << module["path"];
-        // Each sample has one model; the frei0r bridge beside them has one per effect.
-        for (const json& model : module["models"]) byName[model["name"].get<std::string>()] = model;
+        EXPECT_TRUE(module["ok"].get<bool>()) << module.dump();
+        ASSERT_EQ(module["models"].size(), 1u) << module["path"];
+        const json& model = module["models"][0];
+        byName[model["name"].get<std::string>()] = model;
     }
-    for (const char* sample : {"Levels", "Gaussian Blur", "Wipe", "Generator", "Crop"})
-        EXPECT_EQ(byName.count(sample), 1u) << sample;
     ASSERT_EQ(byName.count("Levels"), 1u);
 
     const json& levels = byName["Levels"];
