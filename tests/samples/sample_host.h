@@ -11,8 +11,10 @@
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
+#include <initializer_list>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "test_paths.h"
@@ -62,23 +64,35 @@ class HostImage {
     HostImage& operator=(const HostImage&) = delete;
 
     ulkImage* get() const { return mImage; }
+    ulkImgFormat format() const { return mFormat; }
+    unsigned char* data() { return mPixels.data(); }
     int width() const { return mWidth; }
     int height() const { return mHeight; }
-    int maxValue() const { return mBytes == 1 ? 255 : 65535; }
 
     Rgba Get(int x, int y) const {
         Rgba value;
-        const auto order = OrderOf(mFormat);
-        for (int c = 0; c < 4; ++c) value[c] = Sample(x, y, order[c]);
+        for (int c = 0; c < 4; ++c) {
+            uint16_t v = mPixels[Offset(x, y, c)];
+            if (mBytes == 2) std::memcpy(&v, &mPixels[Offset(x, y, c)], 2);
+            value[c] = v;
+        }
         return value;
     }
     void Put(int x, int y, const Rgba& value) {
-        const auto order = OrderOf(mFormat);
-        for (int c = 0; c < 4; ++c) SetSample(x, y, order[c], value[c]);
+        for (int c = 0; c < 4; ++c) {
+            const uint16_t v = static_cast<uint16_t>(value[c]);
+            if (mBytes == 2) std::memcpy(&mPixels[Offset(x, y, c)], &v, 2);
+            if (mBytes == 1) mPixels[Offset(x, y, c)] = static_cast<unsigned char>(v);
+        }
+    }
+    /// Puts pixel(x, y) everywhere.
+    template <typename Pixel>
+    void Paint(Pixel pixel) {
+        for (int y = 0; y < mHeight; ++y)
+            for (int x = 0; x < mWidth; ++x) Put(x, y, pixel(x, y));
     }
     void Fill(const Rgba& value) {
-        for (int y = 0; y < mHeight; ++y)
-            for (int x = 0; x < mWidth; ++x) Put(x, y, value);
+        Paint([&](int, int) { return value; });
     }
     /// True when every padding byte still holds the marker.
     bool PaddingIntact() const {
@@ -90,24 +104,10 @@ class HostImage {
     }
 
   private:
-    size_t Offset(int x, int y, int sample) const {
-        return static_cast<size_t>(y) * mRowDelta + (static_cast<size_t>(x) * 4 + sample) * mBytes;
-    }
-    int Sample(int x, int y, int sample) const {
-        const unsigned char* p = &mPixels[Offset(x, y, sample)];
-        if (mBytes == 1) return *p;
-        uint16_t v;
-        std::memcpy(&v, p, 2);
-        return v;
-    }
-    void SetSample(int x, int y, int sample, int value) {
-        unsigned char* p = &mPixels[Offset(x, y, sample)];
-        if (mBytes == 1) {
-            *p = static_cast<unsigned char>(value);
-        } else {
-            const uint16_t v = static_cast<uint16_t>(value);
-            std::memcpy(p, &v, 2);
-        }
+    /// Where channel c (0: R, 1: G, 2: B, 3: A) of pixel (x, y) lies.
+    size_t Offset(int x, int y, int c) const {
+        return static_cast<size_t>(y) * mRowDelta +
+               (static_cast<size_t>(x) * 4 + OrderOf(mFormat)[c]) * mBytes;
     }
 
     ulkImgFormat mFormat;
@@ -119,8 +119,10 @@ class HostImage {
 /// One opened sample model and one instance of it, closed again on destruction.
 class SampleEffect {
   public:
-    explicit SampleEffect(const std::string& name) : mModel(0) {
-        mOpened = mModel.Open(SamplePluginPath(name).c_str(), 0, nullptr);
+    explicit SampleEffect(const std::string& name) : SampleEffect(SamplePluginPath(name), 0) {}
+    /// Model `number` of the module at path.
+    SampleEffect(const std::string& path, short number) : mModel(number) {
+        mOpened = mModel.Open(path.c_str(), 0, nullptr);
         if (mOpened) mInstance = mModel.NewInstance();
         if (mInstance) {
             mInstance->SetVideoType(kVideoTypeProgressive);
@@ -150,11 +152,24 @@ class SampleEffect {
         mInstance->SetCurrentFrame(frame);
     }
 
-    /// Runs a filter from `in` to `out` over the whole output.
-    bool Run(HostImage& in, HostImage& out) {
-        return mInstance->SetInput(0, in.get()) && mInstance->SetOutput(0, out.get()) &&
-               mInstance->Execute(nullptr);
+    /// Sets parameters from their text, as a host's settings would.
+    bool Set(std::initializer_list<std::pair<const char*, const char*>> settings) {
+        for (const auto& [id, text] : settings) {
+            ulkParameter* param = mInstance->FindParameter(id);
+            if (!param || !param->ParseValue(0.0, text)) return false;
+        }
+        return true;
     }
+    bool Set(const char* id, const char* text) { return Set({{id, text}}); }
+
+    /// Runs the effect from the inputs into out over region (null: the whole output).
+    bool Run(const std::vector<HostImage*>& inputs, HostImage& out,
+             const ulkBounds* region = nullptr) {
+        for (size_t i = 0; i < inputs.size(); ++i)
+            if (!mInstance->SetInput(static_cast<int>(i), inputs[i]->get())) return false;
+        return mInstance->SetOutput(0, out.get()) && mInstance->Execute(region);
+    }
+    bool Run(HostImage& in, HostImage& out) { return Run({&in}, out); }
 
   private:
     ulkHostModel mModel;
@@ -168,27 +183,35 @@ class SampleTest : public ::testing::Test {
     void SetUp() override {
         mSavedMaxDLLs = ulkDLLMaker::mMaxDLLs;
         ulkDLLMaker::SetActiveDLLs(4);  // a test may hold several samples at once
-        ulkHostModel::SetAllocCallback(&std::malloc);
-        ulkHostModel::SetFreeCallback(&std::free);
-        ulkHostInstance::SetAllocCallback(&std::malloc);
-        ulkHostInstance::SetFreeCallback(&std::free);
-        ulkHostOverlay::SetAllocCallback(&std::malloc);
-        ulkHostOverlay::SetFreeCallback(&std::free);
+        Install(&std::malloc, &std::free);
     }
     void TearDown() override {
-        ulkHostModel::SetAllocCallback(nullptr);
-        ulkHostModel::SetFreeCallback(nullptr);
-        ulkHostInstance::SetAllocCallback(nullptr);
-        ulkHostInstance::SetFreeCallback(nullptr);
-        ulkHostOverlay::SetAllocCallback(nullptr);
-        ulkHostOverlay::SetFreeCallback(nullptr);
+        Install(nullptr, nullptr);
         ulkDLLMaker::SetActiveDLLs(mSavedMaxDLLs);
         EXPECT_EQ(ulkDLLMaker::GetNumLoaded(), 0);  // every model was closed
     }
 
   private:
+    static void Install(ulkAllocCallback alloc, ulkFreeCallback release) {
+        ulkHostModel::SetAllocCallback(alloc);
+        ulkHostModel::SetFreeCallback(release);
+        ulkHostInstance::SetAllocCallback(alloc);
+        ulkHostInstance::SetFreeCallback(release);
+        ulkHostOverlay::SetAllocCallback(alloc);
+        ulkHostOverlay::SetFreeCallback(release);
+    }
     int16_t mSavedMaxDLLs = 1;
 };
+
+/// Checks every pixel of image against expected(x, y), stopping at the first
+/// difference, and that no padding byte was written.
+template <typename Expected>
+void ExpectPixels(const HostImage& image, Expected expected) {
+    for (int y = 0; y < image.height(); ++y)
+        for (int x = 0; x < image.width(); ++x)
+            ASSERT_EQ(image.Get(x, y), Rgba(expected(x, y))) << "at " << x << "," << y;
+    EXPECT_TRUE(image.PaddingIntact());
+}
 
 /// The formats every sample accepts, for parameterised tests.
 const ulkImgFormat kSampleFormats[] = {kImgFormatRGBA, kImgFormatBGRA, kImgFormatARGB};
