@@ -94,38 +94,12 @@ inline std::map<std::string, int> BridgeModelNumbers() {
     return numbers;
 }
 
-/// One model of the bridge (from the default folders) and one instance of it.
-class BridgeEffect {
+/// One model of the bridge (from the folders searched) and one instance of it.
+class BridgeEffect : public SampleEffect {
   public:
-    explicit BridgeEffect(const std::string& identifier) : mModel(NumberOf(identifier)) {
-        if (mModel.Open(BridgePath().c_str(), 0, nullptr)) mInstance = mModel.NewInstance();
-        if (mInstance) {
-            mInstance->SetVideoType(kVideoTypeProgressive);
-            mInstance->SetFrameRate(25.0);
-            SetFrame(0, 1);
-        }
-    }
-    ~BridgeEffect() {
-        if (mInstance) mModel.DeleteInstance(mInstance);
-    }
-
-    bool ok() const { return mInstance != nullptr; }
-    ulkHostModel& model() { return mModel; }
-    ulkHostInstance* instance() const { return mInstance; }
-    ulkParameter* Param(const char* id) const { return mInstance->FindParameter(id); }
-    template <typename Kind>
-    Kind* Param(const char* id) const {
-        return dynamic_cast<Kind*>(Param(id));
-    }
-    void SetFrame(int frame, int frames) {
-        mInstance->SetTotalFrames(frames);
-        mInstance->SetCurrentFrame(frame);
-    }
-    /// Runs the effect with the inputs (none to three) into out.
-    bool Run(const std::vector<HostImage*>& inputs, HostImage& out) {
-        for (size_t i = 0; i < inputs.size(); ++i)
-            if (!mInstance->SetInput(static_cast<int>(i), inputs[i]->get())) return false;
-        return mInstance->SetOutput(0, out.get()) && mInstance->Execute(nullptr);
+    explicit BridgeEffect(const std::string& identifier)
+        : SampleEffect(BridgePath(), NumberOf(identifier)) {
+        if (ok()) instance()->SetFrameRate(25.0);
     }
 
   private:
@@ -134,9 +108,6 @@ class BridgeEffect {
         const auto found = numbers.find(identifier);
         return static_cast<short>(found == numbers.end() ? -1 : found->second);
     }
-
-    ulkHostModel mModel;  // closes itself when destroyed
-    ulkHostInstance* mInstance = nullptr;
 };
 
 inline Bytes ReadFile(const fs::path& path) {
@@ -157,9 +128,10 @@ inline bool RunFfmpeg(const std::string& arguments) {
 
 /// Tight RGBA bytes into a host image, and back out.
 inline void LoadFrame(const unsigned char* rgba, HostImage& image) {
-    for (int y = 0; y < image.height(); ++y)
-        for (int x = 0; x < image.width(); ++x, rgba += 4)
-            image.Put(x, y, {rgba[0], rgba[1], rgba[2], rgba[3]});
+    image.Paint([&](int x, int y) {
+        const unsigned char* p = rgba + (static_cast<size_t>(y) * image.width() + x) * 4;
+        return Rgba{p[0], p[1], p[2], p[3]};
+    });
 }
 inline void AppendFrame(const HostImage& image, Bytes* bytes) {
     for (int y = 0; y < image.height(); ++y)
