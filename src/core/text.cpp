@@ -6,11 +6,10 @@ namespace ulk {
 
 void CopyTerminated(char* dest, const char* text, size_t size) {
     if (size == 0) return;
-    size_t n = 0;
-    if (text) {
-        while (n < size - 1 && text[n] != '\0') ++n;
-        std::memcpy(dest, text, n);
-    }
+    // strnlen and one block copy: error records reset their texts on every
+    // wrapped plug-in call, so this sits on the per-frame path.
+    const size_t n = text ? strnlen(text, size - 1) : 0;
+    std::memcpy(dest, text ? text : "", n);
     dest[n] = '\0';
 }
 

@@ -375,6 +375,11 @@ bool ulkImage::Copy(const ulkImage* source, const ulkBounds* region) {
     for (int p = 0; p < planes; ++p) {
         if (to[p].rowBytes <= 0) continue;
         const size_t rowBytes = static_cast<size_t>(to[p].rowBytes);
+        if (mHeight > 0 && to[p].rowDelta == to[p].rowBytes && from[p].rowDelta == to[p].rowBytes) {
+            // Tight rows on both sides: the plane is one block.
+            std::memmove(to[p].data, from[p].data, rowBytes * static_cast<size_t>(mHeight));
+            continue;
+        }
         for (int64_t y = 0; y < mHeight; ++y)
             std::memmove(to[p].data + to[p].rowDelta * y, from[p].data + from[p].rowDelta * y,
                          rowBytes);
