@@ -1,6 +1,7 @@
 #include "ulk_tools/frame_image.h"
 
 #include <cstdint>
+#include <cstring>
 
 namespace ulk_tools {
 
@@ -49,6 +50,51 @@ bool OffsetsOf(const ulkImage& image, ChannelOffsets* offsets, std::string* erro
     return true;
 }
 
+// Bit shift of the byte at position (0 to 3) inside a 32-bit word loaded from memory.
+constexpr int ByteShift(int position) {
+#if defined(__BYTE_ORDER__) && __BYTE_ORDER__ == __ORDER_BIG_ENDIAN__
+    return 8 * (3 - position);
+#else
+    return 8 * position;
+#endif
+}
+
+// Moves byte i of each of count four-byte pixels to byte to(i). A word at a time, so that
+// with to() known at compile time the loop is a few shifts and masks the compiler can
+// vectorise.
+template <typename To>
+void SwizzleRow(const uint8_t* src, uint8_t* dst, int count, To to) {
+    for (int x = 0; x < count; ++x, src += 4, dst += 4) {
+        uint32_t in;
+        std::memcpy(&in, src, 4);
+        uint32_t out = 0;
+        for (int i = 0; i < 4; ++i) out |= ((in >> ByteShift(i)) & 0xffu) << ByteShift(to(i));
+        std::memcpy(dst, &out, 4);
+    }
+}
+
+// One row of count pixels from src to dst, byte i of each pixel going to byte to[i]: a plain
+// copy when nothing moves, a compiled shuffle for the channel orders the tools meet (RGBA to
+// and from BGRA, ARGB, ABGR).
+void CopyPixelRow(const uint8_t* src, uint8_t* dst, int count, const int to[4]) {
+    const int code = to[0] | to[1] << 2 | to[2] << 4 | to[3] << 6;
+    switch (code) {
+        case 0 | 1 << 2 | 2 << 4 | 3 << 6:
+            std::memcpy(dst, src, static_cast<size_t>(count) * 4);
+            return;
+        case 2 | 1 << 2 | 0 << 4 | 3 << 6:  // RGBA <-> BGRA
+            return SwizzleRow(src, dst, count, [](int i) { return i == 3 ? 3 : 2 - i; });
+        case 3 | 2 << 2 | 1 << 4 | 0 << 6:  // RGBA <-> ABGR
+            return SwizzleRow(src, dst, count, [](int i) { return 3 - i; });
+        case 1 | 2 << 2 | 3 << 4 | 0 << 6:  // RGBA -> ARGB
+            return SwizzleRow(src, dst, count, [](int i) { return (i + 1) & 3; });
+        case 3 | 0 << 2 | 1 << 4 | 2 << 6:  // ARGB -> RGBA
+            return SwizzleRow(src, dst, count, [](int i) { return (i + 3) & 3; });
+        default:
+            return SwizzleRow(src, dst, count, [to](int i) { return to[i]; });
+    }
+}
+
 }  // namespace
 
 bool IsFourChannelOrder(ulkImgFormat format) {
@@ -73,11 +119,22 @@ ImagePtr WrapFrame(Frame& frame, ulkImgFormat order) {
 bool CopyImageToFrame(const ulkImage& image, Frame* frame, std::string* error) {
     ChannelOffsets at{};
     if (!OffsetsOf(image, &at, error)) return false;
-    if (!frame->Allocate(image.GetWidth(), image.GetHeight())) {
+    // A frame of the right size is reused: its samples are all overwritten.
+    if ((frame->Width() != image.GetWidth() || frame->Height() != image.GetHeight()) &&
+        !frame->Allocate(image.GetWidth(), image.GetHeight())) {
         *error = "cannot hold an image of " + SizeText(image.GetWidth(), image.GetHeight());
         return false;
     }
     const int step = image.GetPixelDelta(0);
+    if (step == 4 && at.a >= 0) {
+        // Image byte at.r goes to frame byte 0, and so on.
+        int to[4];
+        to[at.r] = 0, to[at.g] = 1, to[at.b] = 2, to[at.a] = 3;
+        for (int y = 0; y < frame->Height(); ++y)
+            CopyPixelRow(static_cast<const uint8_t*>(image.GetRowPtr(y, 0)), frame->Row(y),
+                         frame->Width(), to);
+        return true;
+    }
     for (int y = 0; y < frame->Height(); ++y) {
         const auto* src = static_cast<const unsigned char*>(image.GetRowPtr(y, 0));
         uint8_t* dst = frame->Row(y);
@@ -100,6 +157,13 @@ bool CopyFrameToImage(const Frame& frame, ulkImage* image, std::string* error) {
         return false;
     }
     const int step = image->GetPixelDelta(0);
+    if (step == 4 && at.a >= 0) {
+        const int to[4] = {at.r, at.g, at.b, at.a};
+        for (int y = 0; y < frame.Height(); ++y)
+            CopyPixelRow(frame.Row(y), static_cast<uint8_t*>(image->GetRowPtr(y, 0)), frame.Width(),
+                         to);
+        return true;
+    }
     for (int y = 0; y < frame.Height(); ++y) {
         const uint8_t* src = frame.Row(y);
         auto* dst = static_cast<unsigned char*>(image->GetRowPtr(y, 0));

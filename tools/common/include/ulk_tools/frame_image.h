@@ -5,7 +5,8 @@
 // viewed in any 8-bit four-channel order the library knows (RGBA, BGRA, ARGB, ABGR), which
 // is how a tool feeds an effect that wants BGRA: wrap a scratch frame as BGRA and
 // CopyFrameToImage into it. The copy functions go through the image's channel pointers and
-// steps, so they work for any 8-bit interleaved RGB-family image, three or four channels.
+// steps, so they work for any 8-bit interleaved RGB-family image, three or four channels;
+// rows of four-byte pixels are copied whole (same order) or shuffled a word at a time.
 #ifndef ULK_TOOLS_FRAME_IMAGE_H
 #define ULK_TOOLS_FRAME_IMAGE_H
 
@@ -32,9 +33,9 @@ bool IsFourChannelOrder(ulkImgFormat format);
 /// Null when the frame is empty, the order is not a four-channel one or memory ran out.
 ImagePtr WrapFrame(Frame& frame, ulkImgFormat order = kImgFormatRGBA);
 
-/// Copies image into frame as RGBA (frame is resized to the image); an image without alpha
-/// gives alpha 255. False with a message when the image is not 8-bit interleaved RGB-family
-/// or has no data.
+/// Copies image into frame as RGBA (frame is resized to the image, or reused when it has the
+/// image's size); an image without alpha gives alpha 255. False with a message when the image is
+/// not 8-bit interleaved RGB-family or has no data.
 bool CopyImageToFrame(const ulkImage& image, Frame* frame, std::string* error);
 
 /// Copies an RGBA frame into image, in whatever channel order the image has (alpha is dropped
