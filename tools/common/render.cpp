@@ -122,7 +122,8 @@ bool ChooseOrder(const Effect& effect, ulkImgFormat* order, std::string* note, s
     return false;
 }
 
-// An image in the effect's pixel format with pixels of its own.
+// An image in the effect's pixel format with pixels of its own, made once per worker and
+// reused for every frame.
 class EffectImage {
   public:
     EffectImage() = default;
@@ -133,6 +134,7 @@ class EffectImage {
     }
 
     bool Make(ulkImgFormat order, int width, int height) {
+        mOrder = order;
         if (IsFourChannelOrder(order)) {
             if (!mPixels.Allocate(width, height)) return false;
             mImage = WrapFrame(mPixels, order);
@@ -150,8 +152,12 @@ class EffectImage {
     }
 
     ulkImage* Image() const { return mImage.get(); }
+    /// The image's own pixels as an RGBA frame when the image is RGBA, so that pictures go
+    /// in and out without a conversion; null for any other order.
+    Frame* RgbaPixels() { return mImage && mOrder == kImgFormatRGBA ? &mPixels : nullptr; }
 
   private:
+    ulkImgFormat mOrder = kImgFormatAny;
     Frame mPixels;
     ImagePtr mImage;
     void* mBuffer = nullptr;
@@ -164,8 +170,15 @@ struct Worker {
     Effect effect;
     std::vector<std::unique_ptr<EffectImage>> inputs;
     EffectImage output;
-    std::vector<Frame> scratch;  // RGBA pictures read for the current frame
-    Frame result;
+    std::vector<Frame> scratch;  // RGBA pictures converted into inputs that are not RGBA
+    Frame result;                // the output as RGBA when the effect's order is another
+
+    // Where input i's RGBA picture is made or read: into the input image itself when it is
+    // RGBA, else into the scratch picture it is converted from.
+    Frame* Picture(size_t i) {
+        Frame* direct = inputs[i]->RgbaPixels();
+        return direct ? direct : &scratch[i];
+    }
 };
 
 // The job as the workers see it: read-only while they run.
@@ -173,109 +186,96 @@ struct Job {
     const RenderSettings* settings = nullptr;
     std::vector<Source> sources;
     int width = 0, height = 0;
-    bool writeFiles = true;  // false: results are kept for the raw output stream
+    int stream = -1;      // the source read from the raw input stream, or -1
+    bool rawOut = false;  // results go to the raw output stream in frame order, else to files
 };
 
-// Renders one frame with worker; stream pictures come in streamed (one per stream input).
-bool RenderFrame(const Job& job, Worker* worker, int frame, const std::vector<Frame>& streamed,
-                 std::string* error) {
-    size_t next = 0;
+// Renders frame with worker, whose stream picture (if any) has been read already. Answers the
+// result as RGBA (the output image's own pixels when it is RGBA), or null with a message.
+const Frame* RenderFrame(const Job& job, Worker* worker, int frame, std::string* error) {
+    const std::string at = "frame " + std::to_string(frame) + ": ";
     for (size_t i = 0; i < job.sources.size(); ++i) {
         const Source& source = job.sources[i];
-        const Frame* picture = &worker->scratch[i];
+        // An RGBA picture still to be converted into the input image, if any.
+        const Frame* picture = worker->Picture(i);
         switch (source.kind) {
             case SourceKind::kStill:
                 picture = &source.still;
                 break;
             case SourceKind::kStream:
-                picture = &streamed[next++];
                 break;
             case SourceKind::kPattern:
-                FillTestPattern(&worker->scratch[i], frame);
+                FillTestPattern(worker->Picture(i), frame);
                 break;
             case SourceKind::kSequence:
                 if (!ReadSized(SequenceFramePath(source.sequence, frame), job.width, job.height,
                                &worker->scratch[i], error))
-                    return false;
+                    return nullptr;
+                picture = &worker->scratch[i];
                 break;
         }
-        if (!CopyFrameToImage(*picture, worker->inputs[i]->Image(), error)) {
-            *error = "frame " + std::to_string(frame) + ": " + *error;
-            return false;
+        if (picture != worker->inputs[i]->RgbaPixels() &&
+            !CopyFrameToImage(*picture, worker->inputs[i]->Image(), error)) {
+            *error = at + *error;
+            return nullptr;
         }
     }
     ulkHostInstance* instance = worker->effect.Instance();
     instance->SetCurrentFrame(frame);
     const ulkBounds bounds = {0, 0, job.width - 1, job.height - 1};
     if (!instance->Execute(&bounds)) {
-        *error = "frame " + std::to_string(frame) + ": " + worker->effect.Name() +
-                 " failed: " + instance->GetErrorString();
-        return false;
+        *error = at + worker->effect.Name() + " failed: " + instance->GetErrorString();
+        return nullptr;
     }
     // An in-place effect with nothing to do leaves the picture to the host: its input is
     // the output then.
     if (!job.sources.empty() && !instance->HasEffect() && instance->InPlace() &&
         !worker->output.Image()->Copy(worker->inputs[0]->Image(), nullptr)) {
-        *error = "frame " + std::to_string(frame) + ": cannot pass the input through";
-        return false;
+        *error = at + "cannot pass the input through";
+        return nullptr;
     }
+    if (const Frame* direct = worker->output.RgbaPixels()) return direct;
     if (!CopyImageToFrame(*worker->output.Image(), &worker->result, error)) {
-        *error = "frame " + std::to_string(frame) + ": " + *error;
-        return false;
+        *error = at + *error;
+        return nullptr;
     }
-    if (!job.writeFiles) return true;
-    return WriteImage(SequenceFramePath(job.settings->output, frame), worker->result, error);
+    return &worker->result;
 }
 
-// Frames handed out to the workers, and the first failure.
+// Runs the frames on the workers. Each worker in turn takes the next frame number and reads
+// its stream picture straight into its own input (so frames are read in order), renders,
+// and writes its result: a file at once, a raw frame once every frame before it is written
+// (so frames are written in order). Reading, rendering and writing of different frames
+// overlap, every worker keeps its pictures from frame to frame, and no more than one frame a
+// worker is ever held. On a failure no new frame starts; frames before the earliest failing
+// one are still completed, later ones are dropped, and that frame's message is reported.
 class Schedule {
   public:
-    Schedule(const std::vector<int>& frames, const std::vector<std::vector<Frame>>* streamed,
-             std::vector<Frame>* results)
-        : mFrames(frames), mStreamed(streamed), mResults(results) {}
+    Schedule(const Job& job, const FrameRange& range, bool openEnded)
+        : mJob(job),
+          mRange(range),
+          mOpenEnded(openEnded),
+          mNext(range.first),
+          mNextWrite(range.first) {}
 
-    void Work(const Job& job, Worker* worker) {
-        static const std::vector<Frame> kNone;
-        for (;;) {
-            size_t index;
-            {
-                std::lock_guard<std::mutex> lock(mMutex);
-                if (mFailed || mNext == mFrames.size()) return;
-                index = mNext++;
-            }
-            std::string error;
-            const bool ok = RenderFrame(job, worker, mFrames[index],
-                                        mStreamed ? (*mStreamed)[index] : kNone, &error);
-            if (ok && mResults) (*mResults)[index] = worker->result;
-            std::lock_guard<std::mutex> lock(mMutex);
-            if (ok) {
-                ++mDone;
-            } else if (!mFailed || mFrames[index] < mFailedFrame) {
-                // Of several failures the earliest frame's is reported, as one thread would.
-                mFailed = true;
-                mFailedFrame = mFrames[index];
-                mError = error;
-            }
-            mChanged.notify_all();
-        }
-    }
-
-    // Runs the frames on the workers; progress is drawn on this thread.
-    bool Run(const Job& job, std::vector<std::unique_ptr<Worker>>& workers, ProgressBar* bar,
-             long long doneBefore, std::string* error) {
-        const size_t count = std::min(workers.size(), mFrames.size());
-        std::vector<std::thread> threads;
-        for (size_t i = 1; i < count; ++i)
-            threads.emplace_back([this, &job, &workers, i] { Work(job, workers[i].get()); });
-        if (threads.empty()) {
-            Work(job, workers[0].get());
-            bar->Update(doneBefore + static_cast<long long>(mDone));
+    // One worker renders on the calling thread; more run on threads of their own while the
+    // calling thread draws progress, so that every instance stays on one thread.
+    bool Run(const std::vector<std::unique_ptr<Worker>>& workers, ProgressBar* bar,
+             std::string* error) {
+        if (workers.size() == 1) {
+            Work(workers[0].get(), bar);
         } else {
-            // The calling thread only watches, so every worker keeps its own instance.
+            mRunning = workers.size();
+            std::vector<std::thread> threads;
+            for (const auto& worker : workers)
+                threads.emplace_back([this, &worker] { Work(worker.get(), nullptr); });
             std::unique_lock<std::mutex> lock(mMutex);
-            while (!mFailed && mDone < mFrames.size()) {
+            while (mRunning > 0) {
                 mChanged.wait_for(lock, std::chrono::milliseconds(100));
-                bar->Update(doneBefore + static_cast<long long>(mDone));
+                const long long done = mDone;
+                lock.unlock();
+                bar->Update(done);
+                lock.lock();
             }
             lock.unlock();
             for (std::thread& thread : threads) thread.join();
@@ -284,14 +284,96 @@ class Schedule {
         return !mFailed;
     }
 
+    long long Done() const { return mDone; }
+
   private:
-    const std::vector<int>& mFrames;
-    const std::vector<std::vector<Frame>>* mStreamed;
-    std::vector<Frame>* mResults;
-    std::mutex mMutex;
+    void Work(Worker* worker, ProgressBar* bar) {
+        int frame = 0;
+        while (Take(worker, &frame)) {
+            std::string error;
+            const Frame* result = RenderFrame(mJob, worker, frame, &error);
+            Complete(frame, result, error);
+            if (bar) bar->Update(mDone);  // only with one worker, on its own thread
+        }
+        std::lock_guard<std::mutex> lock(mMutex);
+        --mRunning;
+        mChanged.notify_all();
+    }
+
+    // Takes the next frame and reads its stream picture. False when no frame is left, the
+    // stream ended or a failure stopped the run.
+    bool Take(Worker* worker, int* frame) {
+        // Held while reading: frame numbers and stream pictures go out in the same order.
+        std::lock_guard<std::mutex> reading(mReadMutex);
+        {
+            std::lock_guard<std::mutex> lock(mMutex);
+            if (mFailed || mEnded || (!mOpenEnded && mNext > mRange.last)) return false;
+            *frame = mNext++;
+        }
+        if (mJob.stream < 0) return true;
+        std::string error;
+        const RawReadResult read =
+            ReadRawFrame(mJob.settings->rawIn, worker->Picture(mJob.stream), &error);
+        if (read == RawReadResult::kFrame) return true;
+        std::lock_guard<std::mutex> lock(mMutex);
+        if (read == RawReadResult::kError) {
+            Fail(*frame, "standard input, frame " + std::to_string(*frame) + ": " + error);
+        } else if (mOpenEnded) {
+            mEnded = true;
+        } else {
+            Fail(*frame, "standard input ended before frame " + std::to_string(*frame) +
+                             " (--frames asks for " + std::to_string(mRange.first) + "-" +
+                             std::to_string(mRange.last) + ")");
+        }
+        mChanged.notify_all();
+        return false;
+    }
+
+    // Writes frame's result (null: rendering failed with error) and records the outcome.
+    void Complete(int frame, const Frame* result, std::string error) {
+        bool ok = result != nullptr;
+        if (ok && !mJob.rawOut)
+            ok = WriteImage(SequenceFramePath(mJob.settings->output, frame), *result, &error);
+        std::unique_lock<std::mutex> lock(mMutex);
+        if (ok && mJob.rawOut) {
+            mChanged.wait(lock,
+                          [&] { return mNextWrite == frame || (mFailed && mFailedFrame < frame); });
+            if (mNextWrite != frame) return;  // an earlier frame failed: this one is dropped
+            // The stream is this thread's alone until mNextWrite moves on.
+            lock.unlock();
+            ok = WriteRawFrame(mJob.settings->rawOut, *result, &error);
+            if (!ok) error = "standard output: " + error;
+            lock.lock();
+            if (ok) ++mNextWrite;
+        }
+        if (ok)
+            ++mDone;
+        else
+            Fail(frame, error);
+        mChanged.notify_all();  // the next frame's writer and the progress wait for this
+    }
+
+    // Records a failure at frame; of several, the earliest frame's is kept, as one thread
+    // would report it. Call with mMutex held.
+    void Fail(int frame, const std::string& error) {
+        if (!mFailed || frame < mFailedFrame) {
+            mFailed = true;
+            mFailedFrame = frame;
+            mError = error;
+        }
+    }
+
+    const Job& mJob;
+    const FrameRange mRange;
+    const bool mOpenEnded;
+    std::mutex mReadMutex;
+    std::mutex mMutex;  // guards everything below
     std::condition_variable mChanged;
-    size_t mNext = 0;
-    size_t mDone = 0;
+    int mNext;       // the next frame to take
+    int mNextWrite;  // the next frame to write to the raw output
+    bool mEnded = false;
+    size_t mRunning = 0;
+    long long mDone = 0;
     bool mFailed = false;
     int mFailedFrame = 0;
     std::string mError;
@@ -318,13 +400,18 @@ bool SetUpEffect(const RenderSettings& settings, int modelIndex, int totalFrames
 // Gives the worker's instance its input and output images.
 bool SetUpImages(const Job& job, ulkImgFormat order, Worker* worker, std::string* error) {
     ulkHostInstance* instance = worker->effect.Instance();
-    for (size_t i = 0; i < job.sources.size(); ++i)
-        worker->inputs.push_back(std::make_unique<EffectImage>());
     worker->scratch.resize(job.sources.size());
     for (size_t i = 0; i < job.sources.size(); ++i) {
-        if (!worker->inputs[i]->Make(order, job.width, job.height) ||
-            !worker->scratch[i].Allocate(job.width, job.height) ||
-            !instance->SetInput(static_cast<int>(i), worker->inputs[i]->Image())) {
+        worker->inputs.push_back(std::make_unique<EffectImage>());
+        EffectImage& input = *worker->inputs[i];
+        // Patterns and stream pictures are made in place; a scratch picture is needed only to
+        // convert them to another order (sequence files bring their own).
+        const SourceKind kind = job.sources[i].kind;
+        const bool scratch = (kind == SourceKind::kPattern || kind == SourceKind::kStream) &&
+                             order != kImgFormatRGBA;
+        if (!input.Make(order, job.width, job.height) ||
+            (scratch && !worker->scratch[i].Allocate(job.width, job.height)) ||
+            !instance->SetInput(static_cast<int>(i), input.Image())) {
             *error = "cannot set up input " + std::to_string(i + 1) + " (out of memory?)";
             return false;
         }
@@ -423,14 +510,16 @@ bool Render(const RenderSettings& settings, const std::function<void(const std::
     for (const std::string& input : settings.inputs) {
         job.sources.emplace_back();
         if (!ParseSource(input, settings, &job.sources.back(), error)) return false;
-        streams += job.sources.back().kind == SourceKind::kStream;
+        if (job.sources.back().kind != SourceKind::kStream) continue;
+        job.stream = static_cast<int>(job.sources.size()) - 1;
+        ++streams;
     }
     if (streams > 1) {
         *error = "only one input can be '-' (standard input)";
         return false;
     }
     const bool rawOut = IsStream(settings.output);
-    job.writeFiles = !rawOut;
+    job.rawOut = rawOut;
 
     // The frames: as asked, else the first sequence's files, else frame 0 (or, for a stream,
     // frames from 0 until it ends).
@@ -511,59 +600,10 @@ bool Render(const RenderSettings& settings, const std::function<void(const std::
 
     ProgressBar bar(known, settings.quiet || openEnded);
     const auto start = std::chrono::steady_clock::now();
-    long long done = 0;
-    if (streams == 0 && !rawOut) {
-        std::vector<int> frames;
-        for (int f = range.first; f <= range.last; ++f) frames.push_back(f);
-        Schedule schedule(frames, nullptr, nullptr);
-        if (!schedule.Run(job, workers, &bar, 0, error)) return false;
-        done = range.Count();
-    } else {
-        // Streams keep frame order: read a batch, render it, write it, in turn.
-        const size_t batch = workers.size() * 2;
-        int frame = range.first;
-        for (;;) {
-            std::vector<int> frames;
-            std::vector<std::vector<Frame>> streamed;
-            while (frames.size() < batch && (openEnded || frame <= range.last)) {
-                std::vector<Frame> pictures;
-                if (streams) {
-                    pictures.emplace_back();
-                    if (!pictures[0].Allocate(job.width, job.height)) {
-                        *error = "out of memory";
-                        return false;
-                    }
-                    const RawReadResult read = ReadRawFrame(settings.rawIn, &pictures[0], error);
-                    if (read == RawReadResult::kError) {
-                        *error = "standard input, frame " + std::to_string(frame) + ": " + *error;
-                        return false;
-                    }
-                    if (read == RawReadResult::kEnd) {
-                        if (openEnded) break;
-                        *error = "standard input ended before frame " + std::to_string(frame) +
-                                 " (--frames asks for " + std::to_string(range.first) + "-" +
-                                 std::to_string(range.last) + ")";
-                        return false;
-                    }
-                }
-                frames.push_back(frame++);
-                streamed.push_back(std::move(pictures));
-            }
-            if (frames.empty()) break;
-            std::vector<Frame> results(rawOut ? frames.size() : 0);
-            Schedule schedule(frames, &streamed, rawOut ? &results : nullptr);
-            if (!schedule.Run(job, workers, &bar, done, error)) return false;
-            for (const Frame& result : results)
-                if (!WriteRawFrame(settings.rawOut, result, error)) {
-                    *error = "standard output: " + *error;
-                    return false;
-                }
-            done += static_cast<long long>(frames.size());
-            if (frames.size() < batch) break;
-        }
-    }
+    Schedule schedule(job, range, openEnded);
+    if (!schedule.Run(workers, &bar, error)) return false;
     bar.Finish();
-    summary->frames = done;
+    summary->frames = schedule.Done();
     summary->seconds =
         std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
     return true;

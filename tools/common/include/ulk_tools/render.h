@@ -8,8 +8,10 @@
 // Several frames can render at once: every worker thread has its own model and instance,
 // all opened, set up and given the same parameter values on the calling thread before any
 // worker starts; a worker then only reads its frames' inputs, executes its own instance and
-// writes its frames. Raw streams are read and written in frame order on the calling thread,
-// so the result does not depend on the number of threads.
+// writes its frames. The workers take turns at the raw input stream, so frames are read in
+// frame order, and raw output frames are written in frame order, so the result does not
+// depend on the number of threads. Pictures are made once per worker and reused; an effect
+// that takes RGBA renders straight from and into them.
 #ifndef ULK_TOOLS_RENDER_H
 #define ULK_TOOLS_RENDER_H
 
