@@ -73,6 +73,26 @@ class UlkRender : public ::testing::Test {
         }
     }
 
+    // count frames of the moving test pattern (frame f shows frame f) as a raw RGBA stream,
+    // followed by the first extra bytes of one more frame; answers its path.
+    std::string WriteRawPatterns(const std::string& name, int count, int width, int height,
+                                 size_t extra = 0) {
+        std::FILE* stream = std::fopen(Path(name).c_str(), "wb");
+        if (!stream) {
+            ADD_FAILURE() << "cannot write " << Path(name);
+            return "";
+        }
+        Frame pattern(width, height);
+        std::string error;
+        for (int f = 0; f < count; ++f) {
+            ulk_tools::FillTestPattern(&pattern, f);
+            EXPECT_TRUE(ulk_tools::WriteRawFrame(stream, pattern, &error)) << error;
+        }
+        EXPECT_EQ(std::fwrite(pattern.Data(), 1, extra, stream), extra);
+        std::fclose(stream);
+        return Path(name);
+    }
+
     std::string Path(const std::string& name) const { return mFolder.Path(name); }
 
     static std::string Sample(const std::string& name) { return SamplePluginPath(name); }
@@ -207,16 +227,8 @@ TEST_F(UlkRender, ThreadsAndRawStreamsGiveTheSameFrames) {
     EXPECT_FALSE(Read("one.000.png").SamePixels(Read("one.011.png")));
 
     // The same pattern frames as a raw stream in, raw frames out, on two threads.
-    std::FILE* stream = std::fopen(Path("in.rgba").c_str(), "wb");
-    ASSERT_NE(stream, nullptr);
-    for (int f = 0; f <= 11; ++f) {
-        Frame pattern(48, 32);
-        ulk_tools::FillTestPattern(&pattern, f);
-        std::string error;
-        ASSERT_TRUE(ulk_tools::WriteRawFrame(stream, pattern, &error)) << error;
-    }
-    std::fclose(stream);
-    result = Render(with({"--threads", "2", "--raw", "48x32", "-o", "-", "-"}), Path("in.rgba"));
+    const std::string raw = WriteRawPatterns("in.rgba", 12, 48, 32);
+    result = Render(with({"--threads", "2", "--raw", "48x32", "-o", "-", "-"}), raw);
     ASSERT_EQ(result.status, 0) << result.err;
     ASSERT_EQ(result.out.size(), 12u * 48 * 32 * 4);
     for (int f = 0; f <= 11; ++f) {
@@ -261,16 +273,19 @@ class UlkRenderErrors : public UlkRender {
   protected:
     bool NeedsSamples() const override { return false; }
 
-    // Runs and expects a failure whose one line on stderr holds every text of needles.
-    void ExpectFailure(const std::vector<std::string>& arguments,
-                       const std::vector<std::string>& needles, int status = 1) {
-        const ToolResult result = Render(arguments);
+    // Runs (standard input from the file in, if given) and expects a failure whose one line
+    // on stderr holds every text of needles.
+    ToolResult ExpectFailure(const std::vector<std::string>& arguments,
+                             const std::vector<std::string>& needles, int status = 1,
+                             const std::string& in = "") {
+        const ToolResult result = Render(arguments, in);
         EXPECT_EQ(result.status, status) << result.err;
         EXPECT_EQ(std::count(result.err.begin(), result.err.end(), '\n'), status == 2 ? 2 : 1)
             << result.err;
         for (const std::string& needle : needles)
             EXPECT_NE(result.err.find(needle), std::string::npos)
                 << "'" << needle << "' not in: " << result.err;
+        return result;
     }
 
     std::string FailAt() const { return ToolEffects() + ":org.ulk.tests.fail-at"; }
@@ -328,6 +343,43 @@ TEST_F(UlkRenderErrors, FailingModelsAndExecuteAreReported) {
         EXPECT_TRUE(Read("t1." + std::to_string(f) + ".png").SamePixels(Read("small.png")));
     for (const std::string& name : mFolder.Names())
         EXPECT_EQ(name.find("tmp"), std::string::npos) << name;  // no temporary file left
+}
+
+TEST_F(UlkRenderErrors, RawStreamsOnThreadsKeepFrameOrderUpToTheFirstFailure) {
+    const int width = 24, height = 16;
+    const size_t bytes = size_t{width} * height * 4;
+    const std::string raw = WriteRawPatterns("in.rgba", 40, width, height);
+    const std::string in = ReadTextFile(raw);
+    const std::vector<std::string> stream = {"--raw", "24x16", "-q", "-o", "-", "-"};
+    auto with = [&](std::vector<std::string> arguments) {
+        arguments.insert(arguments.end(), stream.begin(), stream.end());
+        return arguments;
+    };
+
+    // Converted to BGRA and back on three threads: every frame in its place, red cleared.
+    ToolResult result = Render(with({ToolEffects() + ":Clear Red", "--threads", "3"}), raw);
+    ASSERT_EQ(result.status, 0) << result.err;
+    ASSERT_EQ(result.out.size(), 40 * bytes);
+    for (int f = 0; f < 40; ++f) {
+        Frame expected(width, height);
+        ulk_tools::FillTestPattern(&expected, f);
+        for (int y = 0; y < height; ++y)
+            for (int x = 0; x < width; ++x) expected.Pixel(x, y)[0] = 0;
+        EXPECT_EQ(0, std::memcmp(result.out.data() + f * bytes, expected.Data(), bytes))
+            << "raw frame " << f;
+    }
+
+    // Frame 3 fails: frames 0 to 2 come out whole and in order, nothing after them.
+    for (const char* threads : {"1", "3"}) {
+        result = ExpectFailure(with({FailAt(), "--set", "fail_frame=3", "--threads", threads}),
+                               {"frame 3: Fail At failed"}, 1, raw);
+        EXPECT_EQ(result.out, in.substr(0, 3 * bytes)) << threads << " threads";
+    }
+    // A stream cut inside frame 5: frames 0 to 4 come out, the cut one is named.
+    const std::string cut = WriteRawPatterns("cut.rgba", 5, width, height, 100);
+    result = ExpectFailure(with({FailAt(), "--threads", "2"}),
+                           {"standard input, frame 5", "ended inside a frame"}, 1, cut);
+    EXPECT_EQ(result.out, in.substr(0, 5 * bytes));
 }
 
 TEST_F(UlkRenderErrors, UsageErrorsExitWithTwo) {
