@@ -75,15 +75,15 @@ int CountModels(const std::string& path, std::string* error) {
     return module.Load(path, error) ? module.NumModels() : -1;
 }
 
-void SplitEffectSpec(const std::string& spec, std::string* path, std::string* selector) {
-    const size_t colon = spec.rfind(':');
-    if (colon == std::string::npos || IsRegularFile(spec)) {
-        *path = spec;
+void SplitEffectArgument(const std::string& argument, std::string* path, std::string* selector) {
+    const size_t colon = argument.rfind(':');
+    if (colon == std::string::npos || IsRegularFile(argument)) {
+        *path = argument;
         selector->clear();
         return;
     }
-    *path = spec.substr(0, colon);
-    *selector = spec.substr(colon + 1);
+    *path = argument.substr(0, colon);
+    *selector = argument.substr(colon + 1);
 }
 
 int FindModel(const std::string& path, const std::string& selector, std::string* error) {

@@ -175,7 +175,7 @@ int main(int argc, char** argv) {
     }
     if (positional.empty()) return Usage("no plug-in given");
     if (!haveOutput) return Usage("no output given (-o OUTPUT)");
-    ulk_tools::SplitEffectSpec(positional[0], &settings.plugin, &settings.model);
+    ulk_tools::SplitEffectArgument(positional[0], &settings.plugin, &settings.model);
     settings.inputs.assign(positional.begin() + 1, positional.end());
 
     std::string error;

@@ -52,7 +52,7 @@ int CountModels(const std::string& path, std::string* error);
 
 /// Splits "PLUGIN[:MODEL]" into the module path and the model selector (empty when none).
 /// The text is taken whole when it names an existing file.
-void SplitEffectSpec(const std::string& spec, std::string* path, std::string* selector);
+void SplitEffectArgument(const std::string& argument, std::string* path, std::string* selector);
 
 /// The index of the model of path that selector names: its number, its name (any case) or
 /// its identifier; model 0 for an empty selector. -1 with a message when none matches.
