@@ -36,6 +36,17 @@ bool Trapped(ulkHostInstance* instance, ulkHostModel* model, Call call) {
     });
 }
 
+// bounds, or else the whole of output 0 written into whole; null when there
+// is no output image to take the size of.
+const ulkBounds* BoundsOrWholeOutput(const ulkHostInstance& instance, const ulkBounds* bounds,
+                                     ulkBounds* whole) {
+    if (bounds) return bounds;
+    const ulkImage* output = dynamic_cast<const ulkImage*>(instance.GetOutput(0));
+    if (!output) return nullptr;
+    *whole = {0, 0, output->GetWidth() - 1, output->GetHeight() - 1};
+    return whole;
+}
+
 }  // namespace
 
 ulkHostInstance::ulkHostInstance()
@@ -216,14 +227,10 @@ bool ulkHostInstance::Execute(const ulkBounds* bounds) {
     mAborted = false;
 
     ulkBounds whole;
+    bounds = BoundsOrWholeOutput(*this, bounds, &whole);
     if (!bounds) {
-        const ulkImage* output = _OutputImage();
-        if (!output) {
-            mError.SetError(kErrorExecute);
-            return false;
-        }
-        whole = {0, 0, output->GetWidth() - 1, output->GetHeight() - 1};
-        bounds = &whole;
+        mError.SetError(kErrorExecute);
+        return false;
     }
 
     if (!HasEffect()) {
@@ -250,8 +257,7 @@ bool ulkHostInstance::Execute(const ulkBounds* bounds) {
         ulk::SetRenderFlag(1);
     }
 
-    const bool result =
-        Trapped(this, mHostModel, [&] { return mPluginInstance->Execute(bounds); });
+    const bool result = Trapped(this, mHostModel, [&] { return mPluginInstance->Execute(bounds); });
 
     if (preProcessedHere) PostProcess();
 
@@ -266,12 +272,8 @@ bool ulkHostInstance::ShowUIWindow(const ulkBounds* bounds) {
     mAborted = false;
 
     ulkBounds whole;
-    if (!bounds) {
-        const ulkImage* output = _OutputImage();
-        if (!output) return false;
-        whole = {0, 0, output->GetWidth() - 1, output->GetHeight() - 1};
-        bounds = &whole;
-    }
+    bounds = BoundsOrWholeOutput(*this, bounds, &whole);
+    if (!bounds) return false;
 
     mDrawAllowed = true;
     const bool result =
