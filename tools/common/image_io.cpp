@@ -50,12 +50,13 @@ bool ReadImageUnguarded(const std::string& path, Frame* frame, std::string* erro
     }
     if (header.width < 1 || header.height < 1 || header.width > kMaxFrameSide ||
         header.height > kMaxFrameSide || header.nchannels > 64) {
-        *error = path + ": unsupported image size " + SizeText(header.width, header.height) + " with " +
-                 std::to_string(header.nchannels) + " channels";
+        *error = path + ": unsupported image size " + SizeText(header.width, header.height) +
+                 " with " + std::to_string(header.nchannels) + " channels";
         return false;
     }
     // A corrupt header can claim any size; refuse what no real frame needs before allocating.
-    if (static_cast<uint64_t>(header.width) * header.height * header.nchannels > (uint64_t{1} << 31)) {
+    if (static_cast<uint64_t>(header.width) * header.height * header.nchannels >
+        (uint64_t{1} << 31)) {
         *error = path + ": image too large (" + SizeText(header.width, header.height) + " with " +
                  std::to_string(header.nchannels) + " channels)";
         return false;
