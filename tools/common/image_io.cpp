@@ -35,7 +35,8 @@ bool ReadImageUnguarded(const std::string& path, Frame* frame, std::string* erro
         *error = Failure(path, "cannot read image", OIIO::geterror());
         return false;
     }
-    const OIIO::ImageSpec& header = input->spec();
+    // The size, channels and types of the first subimage; its metadata is not needed.
+    const OIIO::ImageSpec header = input->spec_dimensions(0);
     if (header.deep) {
         *error = path + ": deep images are not supported";
         return false;
